@@ -1,0 +1,189 @@
+// The operations of both associations, written once. An association describes itself by a
+// type `Association` with
+//   shape()             its AssociationShape
+//   Factory             the factory of the near objects
+//   Utility             the class with get_assoc_targetClass_ObjectPath
+//   build               buildInstances under the association's own name
+// Every pair of a far and a near object is associated; far objects come outermost. A failed
+// step says so in a line and ends the operation with the status that it left.
+#pragma once
+
+#include "AssociationShape.h"
+#include "FarObjects.h"
+
+#include "../frame/InstanceOperations.h"
+
+#include <platform/TeskCommon.h>
+
+#include <cstring>
+#include <vector>
+
+namespace Tesk {
+namespace SimpleIdentityManagementProvider {
+
+// One request as the association operations see it.
+struct AssociationRequest {
+    const CMPIBroker* broker;
+    const CMPIContext* context;
+    const CMPIResult* result;
+    const CMPIObjectPath* ref;
+    const char** properties;
+};
+
+inline void setReference(CMPIInstance* instance, const char* role, const CMPIObjectPath* path) {
+    CMPIValue value = {};
+    value.ref = const_cast<CMPIObjectPath*>(path); // the interface knows no const reference
+    instance->ft->setProperty(instance, role, &value, CMPI_ref);
+}
+
+inline void addReferenceKey(CMPIObjectPath* own, const char* role, CMPIObjectPath* path) {
+    CMPIValue value = {};
+    value.ref = path;
+    own->ft->addKey(own, role, &value, CMPI_ref);
+}
+
+// Visits every pair of far and near paths, far ones outermost, until `visit(far, near)`
+// returns false. `noNear` is said when the near paths cannot be had. Returns false when a
+// step failed; `status` is then what it left.
+template <class Association, class Visit>
+bool forEachPair(const MarkerLines& lines, const AssociationRequest& request, const char* noNear,
+                 CMPIStatus* status, Visit visit) {
+    typename Association::Factory factory(true, false);
+    const AssociationShape& shape = Association::shape();
+    CMPIObjectPath* farClass =
+        newPath(request.broker, request.ref, shape.farClass, nullptr, status);
+    if (farClass == nullptr) {
+        lines.failed(shape.farPathFailed);
+        return false;
+    }
+    CMPIEnumeration* farPaths =
+        CBEnumInstanceNames(request.broker, request.context, farClass, status);
+    if (enumerationFailed(farPaths, status)) {
+        lines.failed(association::enumerationFailed);
+        return false;
+    }
+    bool going = true;
+    forEachPath(farPaths, [&](CMPIObjectPath* far) {
+        std::vector<CMPIObjectPath*> nearPaths;
+        if (factory.allPaths(request.broker, request.ref, nearPaths, status) != 0) {
+            lines.failed(noNear);
+            return going = false;
+        }
+        const auto count = static_cast<std::uint16_t>(nearPaths.size());
+        for (std::uint16_t i = 0; i < count && going; ++i) {
+            CMPIObjectPath* near = nearPaths.at(i);
+            if (isNull(near)) {
+                lines.failed(association::nullPath);
+                return going = false;
+            }
+            going = visit(far, near);
+        }
+        return going;
+    });
+    return going;
+}
+
+// A new path of the association's own class, or null with the failure said.
+template <class Association>
+CMPIObjectPath* ownPath(const MarkerLines& lines, const AssociationRequest& request,
+                        const char* failedText, CMPIStatus* status) {
+    CMPIObjectPath* path =
+        newPath(request.broker, request.ref, Association::shape().className, nullptr, status);
+    if (path == nullptr) {
+        lines.failed(failedText);
+    }
+    return path;
+}
+
+// Builds every association instance; returns false when a step failed.
+template <class Association>
+bool buildInstances(const MarkerLines& lines, const AssociationRequest& request,
+                    std::vector<CMPIInstance*>& instances, CMPIStatus* status) {
+    const AssociationShape& shape = Association::shape();
+    const auto build = [&](CMPIObjectPath* far, CMPIObjectPath* near) {
+        CMPIObjectPath* own = ownPath<Association>(lines, request, shape.ownPathFailed, status);
+        if (own == nullptr) {
+            return false;
+        }
+        CMPIInstance* instance = CMNewInstance(request.broker, own, status);
+        if (!isNull(instance)) {
+            const char* keys[] = {shape.farRole, shape.nearRole, nullptr};
+            CMSetPropertyFilter(instance, request.properties, keys);
+            setReference(instance, shape.farRole, far);
+            setReference(instance, shape.nearRole, near);
+            instances.push_back(instance);
+        }
+        return true;
+    };
+    return forEachPair<Association>(lines, request, association::noNearPaths, status, build);
+}
+
+// The frame of every operation: markers, the barrier, and the end of the normal path. The
+// body returns false when a step failed.
+template <class Body>
+CMPIStatus associationOperation(const MarkerLines& lines, const AssociationRequest& request,
+                                Body body) {
+    return guarded(request.broker, lines.unit(), lines.site(), [&] {
+        lines.enter();
+        CMPIStatus status = succeeded;
+        if (body(&status)) {
+            CMReturnDone(request.result);
+            lines.leave();
+        }
+        return status;
+    });
+}
+
+template <class Association>
+CMPIStatus enumAssociationNames(const MarkerLines& lines, const AssociationRequest& request) {
+    return associationOperation(lines, request, [&](CMPIStatus* status) {
+        const AssociationShape& shape = Association::shape();
+        const auto returnName = [&](CMPIObjectPath* far, CMPIObjectPath* near) {
+            CMPIObjectPath* own = ownPath<Association>(lines, request, shape.ownNameFailed, status);
+            if (own == nullptr) {
+                return false;
+            }
+            addReferenceKey(own, shape.farRole, far);
+            addReferenceKey(own, shape.nearRole, near);
+            CMReturnObjectPath(request.result, own);
+            return true;
+        };
+        return forEachPair<Association>(lines, request, association::noNearNames, status,
+                                        returnName);
+    });
+}
+
+template <class Association>
+CMPIStatus enumAssociations(const MarkerLines& lines, const AssociationRequest& request) {
+    return associationOperation(lines, request, [&](CMPIStatus* status) {
+        std::vector<CMPIInstance*> instances;
+        if (!Association::build(request.ref, request.properties, request.context, instances,
+                                status)) {
+            return false;
+        }
+        deliver(request.result, instances);
+        return true;
+    });
+}
+
+template <class Association>
+CMPIStatus getAssociation(const MarkerLines& lines, const AssociationRequest& request) {
+    return associationOperation(lines, request, [&](CMPIStatus* status) {
+        if (!hasKeys(request.ref)) {
+            lines.failed(keyMissingText);
+            return true;
+        }
+        std::vector<CMPIInstance*> instances;
+        if (!Association::build(request.ref, request.properties, request.context, instances,
+                                status)) {
+            return false;
+        }
+        if (CMPIInstance* found = findByPath(request.ref, instances); found != nullptr) {
+            CMReturnInstance(request.result, found);
+        }
+        return true;
+    });
+}
+
+} // namespace SimpleIdentityManagementProvider
+} // namespace Tesk

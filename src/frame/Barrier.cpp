@@ -1,0 +1,20 @@
+#include "Barrier.h"
+
+namespace Tesk {
+namespace SimpleIdentityManagementProvider {
+
+CMPIStatus reportEscaped(const CMPIBroker* broker, const UnitTrace& unit, TraceSite site,
+                         const char* text) noexcept {
+    try {
+        unit.message(text, TraceLevel::failure, site);
+    } catch (...) { // out of memory, most likely; the status still tells
+    }
+    try {
+        return makeStatus(broker, CMPI_RC_ERR_FAILED, text);
+    } catch (...) {
+        return {CMPI_RC_ERR_FAILED, nullptr};
+    }
+}
+
+} // namespace SimpleIdentityManagementProvider
+} // namespace Tesk

@@ -1,0 +1,21 @@
+// Memory that runs out once, at a chosen allocation of a chosen library.
+#pragma once
+
+#include <cstddef>
+#include <string>
+
+namespace qelo::test {
+
+// For one thread at a time: only allocations of the thread that armed it count.
+class FailingAllocation {
+public:
+    // From now on the n-th allocation (from 1) that the code of `library`, the path of a
+    // loaded shared library, asks for throws std::bad_alloc. What the C++ library allocates on
+    // its behalf counts too; what other libraries allocate, even when called by it, does not.
+    static void arm(const std::string& library, std::size_t n);
+
+    // Ends it. True when the allocation was reached.
+    static bool disarm();
+};
+
+} // namespace qelo::test

@@ -30,8 +30,9 @@ void writeGroups(const fs::path& etc, int groups) {
     std::ofstream group(etc / "group");
     for (int i = 0; i < groups; ++i) {
         group << "group" << i << ":x:" << 1000 + i << ":";
-        for (int member = 0; member < membersPerGroup; ++member)
+        for (int member = 0; member < membersPerGroup; ++member) {
             group << (member ? "," : "") << nameOf(i * membersPerGroup + member);
+        }
         group << "\n";
     }
 }
@@ -54,8 +55,9 @@ void writeNodes(const fs::path& file, int accounts) {
 
 Population::Population(int accounts) {
     std::string name = (fs::temp_directory_path() / "storebench-XXXXXX").string();
-    if (!::mkdtemp(name.data()))
+    if (!::mkdtemp(name.data())) {
         throw std::runtime_error("no scratch directory");
+    }
     root_ = name;
     fs::create_directories(root_ / "etc");
     writeAccounts(root_ / "etc", accounts);

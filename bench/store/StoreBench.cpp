@@ -89,8 +89,9 @@ void setPerAccount(benchmark::State& state) {
 
 void Read(benchmark::State& state, Form form) {
     const ChosenPopulation population(state, form);
-    for (auto step : state)
+    for (auto step : state) {
         refresh();
+    }
     setPerAccount(state);
 }
 
@@ -99,8 +100,9 @@ void List(benchmark::State& state, Form form) {
     for (auto step : state) {
         std::size_t found = 0;
         Instrumentation cursor;
-        for (cursor.selectNode(UserAccount); cursor; ++cursor)
+        for (cursor.selectNode(UserAccount); cursor; ++cursor) {
             found += readAccount(cursor);
+        }
         benchmark::DoNotOptimize(found);
     }
     setPerAccount(state);

@@ -1,0 +1,45 @@
+#include "AdminCommand.h"
+
+#include "CommandExecutor.h"
+
+#include "platform/CvLogger.h"
+
+#include <exception>
+#include <new>
+
+namespace qelo::store {
+
+namespace {
+
+const std::string& loggerAdminCommand() {
+    static const std::string component = "Qelo.AdminCommand";
+    return component;
+}
+
+constexpr int kFailureLevel = 6000;
+
+CommandOutcome fail(const std::string& reason) {
+    const std::string message = "Command not carried out: " + reason;
+    CvLog::CvLogger::logLevelMessage("executeAdminCommand", "AdminCommand", __LINE__,
+                                     loggerAdminCommand(), kFailureLevel, nullptr, 0, 0, message);
+    CvLog::CvLogger::traceLevelMessage("executeAdminCommand", "AdminCommand", __LINE__,
+                                       loggerAdminCommand(), kFailureLevel, nullptr, 0, 0, message);
+    return {false, reason};
+}
+
+} // namespace
+
+CommandOutcome executeAdminCommand(const std::filesystem::path& root, const std::string& command) {
+    try {
+        const Attempt<std::string> status =
+            executeCommand(root, command, systemFiles(), systemTools());
+        return status ? CommandOutcome{true, *status} : fail(status.reason());
+    } catch (const std::bad_alloc&) {
+        throw;
+    } catch (const std::exception&) {
+        // Its text may be about a path or a value; that there was one is all that is said.
+        return fail("an unexpected error");
+    }
+}
+
+} // namespace qelo::store

@@ -1,0 +1,89 @@
+#include "CommandExecutor.h"
+
+#include "CommandRequest.h"
+#include "GroupCommands.h"
+#include "PasswordHash.h"
+#include "StoreLock.h"
+#include "UserCommands.h"
+
+namespace qelo::store {
+
+namespace {
+
+// Long enough for many commands that each wait for somebody else's tool.
+constexpr std::chrono::minutes kLockLimit{5};
+
+Attempt<std::string> dispatch(const Workplace& workplace, const CommandRequest& request,
+                              const Secret* hash) {
+    switch (request.method) {
+    case Method::CreateUser:
+        return createUser(workplace, request, hash);
+    case Method::ModifyUser:
+        return modifyUser(workplace, request, hash);
+    case Method::DeleteUser:
+        return deleteUser(workplace, request);
+    case Method::SetPassword:
+        return setPassword(workplace, request, *hash);
+    case Method::EnableUser:
+        return enableUser(workplace, request);
+    case Method::DisableUser:
+        return disableUser(workplace, request);
+    case Method::CreateGroup:
+        return createGroup(workplace, request);
+    case Method::DeleteGroup:
+        return deleteGroup(workplace, request);
+    case Method::AddMember:
+        return addMember(workplace, request);
+    case Method::RemoveMember:
+        return removeMember(workplace, request);
+    }
+    return Refusal{"the method is unknown"};
+}
+
+// Replaces the password by its hash. The clear text is gone before anything else happens, and
+// other commands do not wait for the hashing, which is slow by design.
+Attempt<Secret> takeHash(CommandRequest& request) {
+    if (!request.password) {
+        return Secret();
+    }
+    Attempt<Secret> hash = hashPassword(*request.password);
+    request.password.reset();
+    return hash;
+}
+
+Attempt<std::string> carryOut(const std::filesystem::path& rootPath, CommandRequest& request,
+                              FileSystem& files, ToolRunner& tools) {
+    const Attempt<Secret> hash = takeHash(request);
+    if (!hash) {
+        return hash.refusal();
+    }
+    const Attempt<RootDirectory> root = RootDirectory::open(rootPath, files);
+    if (!root) {
+        return root.refusal();
+    }
+    const Attempt<StoreLock> lock = StoreLock::take(*root, files, kLockLimit);
+    if (!lock) {
+        return lock.refusal();
+    }
+    return dispatch({*root, files, tools}, request, hash->empty() ? nullptr : &*hash);
+}
+
+} // namespace
+
+Attempt<std::string> executeCommand(const std::filesystem::path& root, std::string_view command,
+                                    FileSystem& files, ToolRunner& tools) {
+    const Attempt<CommandText> text = parseCommandText(command);
+    if (!text) {
+        return text.refusal();
+    }
+    Attempt<CommandRequest> request = parseCommandRequest(*text);
+    if (!request) {
+        return request.refusal();
+    }
+    const Attempt<std::string> status = carryOut(root, *request, files, tools);
+    return status ? status
+                  : Attempt<std::string>(
+                        Refusal{std::string(nameOf(request->method)) + ": " + status.reason()});
+}
+
+} // namespace qelo::store

@@ -1,0 +1,120 @@
+#include "HomeCreation.h"
+
+#include <cerrno>
+#include <fcntl.h>
+#include <unistd.h>
+
+namespace qelo::store {
+
+namespace {
+
+// Whether only the superuser or this process's user can rename things in a directory.
+bool isOwnDirectory(const struct stat& status) {
+    const bool shared = (status.st_mode & (S_IWGRP | S_IWOTH)) != 0;
+    return (status.st_uid == 0 || status.st_uid == ::geteuid()) &&
+           (!shared || (status.st_mode & S_ISVTX) != 0);
+}
+
+} // namespace
+
+Problem NewHome::isAcceptable(const Place& place, Owner owner, bool& exists) {
+    struct stat parent {};
+    struct stat status {};
+    if (!workplace_.files.status(place.parent.get(), parent) || !isOwnDirectory(parent)) {
+        return "the home directory's parent can be changed by other users";
+    }
+    exists = workplace_.files.statusAt(place.parent.get(), place.name, status);
+    if (!exists) {
+        return errno == ENOENT ? Problem() : Problem("the home directory cannot be looked at");
+    }
+    return S_ISDIR(status.st_mode) && status.st_uid == owner.user
+               ? Problem()
+               : Problem("the home directory exists and does not belong to the account");
+}
+
+Problem NewHome::copySkeleton(int directory, Owner owner, const std::string& skeleton) {
+    const Attempt<Place> place = findInRoot(workplace_, skeleton);
+    if (!place) {
+        return "the skeleton of home directories: " + place.reason();
+    }
+    if (!place->hasParent()) {
+        return {};
+    }
+    const Descriptor source =
+        workplace_.files.open(place->parent.get(), place->name, O_RDONLY | O_DIRECTORY);
+    if (!source) {
+        return errno == ENOENT ? Problem() : Problem("the skeleton cannot be opened");
+    }
+    return copyTree(workplace_.files, source.get(), directory, owner);
+}
+
+Problem NewHome::fill(int directory, Owner owner, const RootSettings& settings) {
+    if (Problem problem = copySkeleton(directory, owner, settings.skeleton)) {
+        return problem;
+    }
+    FileSystem& files = workplace_.files;
+    return files.changeOwner(directory, owner.user, owner.group) &&
+                   files.changeMode(directory, settings.homeMode)
+               ? Problem()
+               : Problem("the home directory cannot be given to the account");
+}
+
+Problem NewHome::build(const Place& place, Owner owner, const RootSettings& settings) {
+    FileSystem& files = workplace_.files;
+    const int parent = place.parent.get();
+    // Nothing but a killed process of this number can have left one; it is not ours to keep.
+    const std::string draft = ".qelosim-new-" + std::to_string(::getpid());
+    bool removed = false;
+    if (!files.makeDirectory(parent, draft, 0700) &&
+        (errno != EEXIST || removeTree(files, parent, draft, removed) ||
+         !files.makeDirectory(parent, draft, 0700))) {
+        return "the home directory cannot be made";
+    }
+    Problem problem;
+    {
+        const Descriptor directory = files.open(parent, draft, O_RDONLY | O_DIRECTORY);
+        problem = directory ? fill(directory.get(), owner, settings)
+                            : Problem("the home directory cannot be opened");
+    }
+    if (!problem && !files.rename(parent, draft, parent, place.name)) {
+        problem = "the home directory cannot be named";
+    }
+    if (problem) {
+        removeTree(files, parent, draft, removed);
+    }
+    return problem;
+}
+
+Problem NewHome::make(const std::string& path, Owner owner, const RootSettings& settings) {
+    bool exists = false;
+    Attempt<Place> place = ensureParentInRoot(workplace_, path, made_);
+    Problem problem = place ? isAcceptable(*place, owner, exists) : Problem(place.reason());
+    if (!problem && !exists) {
+        problem = build(*place, owner, settings);
+        if (!problem) {
+            home_ = std::move(*place);
+        }
+    }
+    if (problem) {
+        undo();
+    }
+    return problem;
+}
+
+Problem NewHome::undo() {
+    Problem problem;
+    bool removed = false;
+    if (home_) {
+        problem = removeTree(workplace_.files, home_->parent.get(), home_->name, removed);
+        home_.reset();
+    }
+    while (!made_.empty()) {
+        const MadeDirectory& last = made_.back();
+        // Whoever has put something there in the meantime keeps the directory.
+        workplace_.files.removeDirectory(last.parent.get(), last.name);
+        made_.pop_back();
+    }
+    return problem;
+}
+
+} // namespace qelo::store

@@ -1,0 +1,18 @@
+# Fails unless every defined dynamic symbol of LIBRARY is a member of the exported class.
+execute_process(COMMAND ${NM} -D -C --defined-only ${LIBRARY}
+  OUTPUT_VARIABLE symbols RESULT_VARIABLE failed)
+if(failed)
+  message(FATAL_ERROR "${NM} cannot read ${LIBRARY}")
+endif()
+string(REPLACE "\n" ";" lines "${symbols}")
+set(members 0)
+foreach(line ${lines})
+  if(line MATCHES "^[0-9a-f]+ T Tesk::Instrumentation::")
+    math(EXPR members "${members} + 1")
+  else()
+    message(SEND_ERROR "exported beside the class: ${line}")
+  endif()
+endforeach()
+if(members LESS 15)
+  message(SEND_ERROR "only ${members} members of the class are exported")
+endif()

@@ -1,0 +1,52 @@
+// The process around the program: its descriptors, signals and language.
+#include "Application.h"
+#include "local/GroupIds.h"
+#include "local/LocalProviders.h"
+#include "local/RootCommand.h"
+
+#include <clocale>
+#include <csignal>
+#include <cstring>
+#include <fcntl.h>
+#include <langinfo.h>
+#include <unistd.h>
+
+namespace {
+
+// A descriptor that is closed at start would be taken by the first file that is opened, and
+// results would end up in it. Read-only, it refuses whatever is written.
+void occupyStandardDescriptors() {
+    int descriptor = open("/dev/null", O_RDONLY);
+    while (descriptor >= 0 && descriptor <= STDERR_FILENO) {
+        descriptor = open("/dev/null", O_RDONLY);
+    }
+    if (descriptor >= 0) {
+        close(descriptor);
+    }
+}
+
+// Results are UTF-8 whatever the environment says; messages follow the environment.
+void chooseLanguage() {
+    setlocale(LC_MESSAGES, "");
+    setlocale(LC_CTYPE, "");
+    if (std::strcmp(nl_langinfo(CODESET), "UTF-8") != 0) {
+        setlocale(LC_CTYPE, "C.UTF-8");
+    }
+}
+
+} // namespace
+
+int main(int argc, char** argv) {
+    occupyStandardDescriptors();
+    // A reader that goes is noticed when writing fails.
+    std::signal(SIGPIPE, SIG_IGN);
+    chooseLanguage();
+    qelo::cli::FileOutput output(STDOUT_FILENO);
+    qelo::cli::FileOutput errors(STDERR_FILENO);
+    return qelo::cli::runApplication(argc, argv,
+                                     {qelo::cli::connectToLocalProviders,
+                                      output,
+                                      errors,
+                                      {qelo::cli::addRootCommand},
+                                      qelo::cli::localGroupIds});
+}

@@ -265,5 +265,14 @@ TEST_F(FactoriesTest, A_hook_that_throws_becomes_a_status) {
     EXPECT_EQ(text(status.msg), "disk full");
 }
 
+TEST_F(FactoriesTest, Lack_of_memory_becomes_a_status) {
+    hooks.schema.isA = [](const std::string&, const std::string&, const std::string&) -> bool {
+        throw std::bad_alloc();
+    };
+    EXPECT_FALSE(eft().classPathIsA(mb(), path(), "CIM_Base", &st));
+    EXPECT_EQ(st.msg, nullptr);
+    EXPECT_EQ(rc(), CMPI_RC_ERR_FAILED);
+}
+
 } // namespace
 } // namespace qelo::broker::testing

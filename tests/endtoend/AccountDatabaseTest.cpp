@@ -57,6 +57,18 @@ TEST_F(AccountDatabase, Groups_are_the_lines_of_group_with_their_members) {
                             "4 groups\n");
 }
 
+TEST_F(AccountDatabase, A_group_of_50000_members_is_served_whole) {
+    constexpr int members = 50000;
+    std::string joined;
+    for (int i = 0; i < members; ++i) {
+        joined += (i == 0 ? "member" : ",member") + std::to_string(i);
+    }
+    scratch.write("etc/group", "crowd:x:900:" + joined + "\n");
+    const auto groups = json({"groups"});
+    ASSERT_EQ(groups.size(), 1U);
+    EXPECT_EQ(groups[0]["properties"]["GroupMembers"], joined);
+}
+
 TEST_F(AccountDatabase, A_change_on_disk_is_seen_by_the_next_command) {
     EXPECT_EQ(json({"accounts"}).size(), 4U);
     scratch.write("etc/passwd", "root:x:0:0:root:/root:/bin/bash\n");

@@ -104,7 +104,7 @@ TEST_F(SystemTest, Sleep_lasts_at_least_as_long_as_asked) {
 }
 
 TEST_F(SystemTest, Once_runs_once) {
-    static int once = 0;
+    int once = 0;
     counter = 0;
     const auto count = [] { ++counter; };
     EXPECT_EQ(xft().threadOnce(&once, count), 0);

@@ -5,6 +5,7 @@
 
 #include <frame/Barrier.h>
 #include <frame/InstanceWriter.h>
+#include <frame/Keys.h>
 #include <frame/ProviderTables.h>
 
 #include <ClassNames.h>
@@ -27,9 +28,11 @@ constexpr std::uint16_t enabled = 2;      // CIM EnabledState
 constexpr std::uint16_t statusOk = 2;     // CIM OperationalStatus
 constexpr std::uint16_t notDedicated = 0; // CIM Dedicated
 
-std::vector<KeyText> keysOf(const SystemFacts& facts) {
-    return {{"CreationClassName", ComputerSystemClass}, {"Name", facts.name}};
-}
+constexpr KeyRow<const SystemFacts> keyRows[] = {
+    {"CreationClassName", key::fixed<ComputerSystemClass>},
+    {"Name", [](const SystemFacts& facts) { return facts.name; }},
+};
+const KeyTable<const SystemFacts> keys(keyRows);
 
 const std::vector<std::string> identifyingDescriptions = {"ZANTH:OperatingSystem", "ZANTH:Kernel"};
 
@@ -60,7 +63,7 @@ CMPIInstance* makeInstance(const CMPIObjectPath* ref, const char** properties,
                            const SystemFacts& facts) {
     CMPIInstance* instance = newInstance(broker, ref, ComputerSystemClass, nullptr);
     if (instance != nullptr) {
-        setKeys(instance, properties, keysOf(facts));
+        keys.setIn(instance, properties, facts);
         const PropertyFilter filter(properties, PropertyFilter::NullList::Everything);
         const InstanceWriter writer(broker, instance, nullptr);
         for (const auto& row : table) {
@@ -74,10 +77,11 @@ CMPIInstance* makeInstance(const CMPIObjectPath* ref, const char** properties,
 
 // Whether each key that a path names is this system's; one without keys names none.
 bool namesThisSystem(const CMPIObjectPath* path, const SystemFacts& facts) {
-    for (const KeyText& key : keysOf(facts)) {
+    for (const auto& row : keys) {
         CMPIStatus status = {CMPI_RC_OK, nullptr};
-        const CMPIData data = CMGetKey(path, key.name, &status);
-        if (status.rc != CMPI_RC_OK || !holdsText(data) || key.text != textOf(data.value.string)) {
+        const CMPIData data = CMGetKey(path, row.name, &status);
+        if (status.rc != CMPI_RC_OK || !holdsText(data) ||
+            row.text(facts) != textOf(data.value.string)) {
             return false;
         }
     }
@@ -100,7 +104,8 @@ CMPIStatus ComputerSystem_EnumInstanceNames(CMPIInstanceMI*, const CMPIContext*,
         if (path == nullptr) {
             return couldNotMake();
         }
-        addKeys(path, keysOf(readSystemFacts()));
+        const SystemFacts facts = readSystemFacts();
+        keys.addTo(path, facts);
         CMReturnObjectPath(result, path);
         return finish(result);
     });

@@ -2,6 +2,8 @@
 
 #include "SimAccount.h"
 
+#include "../store/RecordLoader.h"
+
 #include <ProviderException.h>
 #include <UnitTrace.h>
 
@@ -115,21 +117,20 @@ bool selectAccounts(Instrumentation& cursor) {
     return true;
 }
 
+void fillAccount(Instrumentation& node, SimAccount& account) {
+    for (const Row& row : rows) {
+        if (row.refused(node, account)) {
+            throw ProviderException(row.message);
+        }
+    }
+}
+
 } // namespace
 
 void setVector(std::vector<SimAccount>& vectSimAccount, Tesk::Instrumentation& instrumentation) {
     CallTrace call(unit, parameters(" vectSimAccount=", &vectSimAccount,
                                     " instrumentation=", &instrumentation));
-    while (instrumentation) {
-        SimAccount account;
-        for (const Row& row : rows) {
-            if (row.refused(instrumentation, account)) {
-                throw ProviderException(row.message);
-            }
-        }
-        vectSimAccount.push_back(std::move(account));
-        ++instrumentation;
-    }
+    appendRecords(instrumentation, vectSimAccount, fillAccount);
     call.leave();
 }
 

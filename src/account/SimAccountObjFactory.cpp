@@ -3,7 +3,6 @@
 #include "../store/RefreshHandshake.h"
 
 #include <ClassNames.h>
-#include <platform/TeskCommon.h>
 
 #include <cstring>
 #include <iterator>
@@ -15,12 +14,12 @@ namespace {
 const std::string loggerSimAccountObjFactory("Corvane.SimAccountObjFactory");
 const UnitTrace unit(loggerSimAccountObjFactory, "SimAccountObjFactory");
 
-std::vector<KeyText> keysOf(SimAccount& account) {
-    return {{"SystemCreationClassName", ComputerSystemClass},
-            {"SystemName", getSystemName()},
-            {"CreationClassName", AccountClass},
-            {"Name", account.getName()}};
-}
+constexpr KeyRow<SimAccount> keys[] = {
+    {"SystemCreationClassName", key::fixed<ComputerSystemClass>},
+    {"SystemName", key::systemName},
+    {"CreationClassName", key::fixed<AccountClass>},
+    {"Name", key::text<&SimAccount::getName>},
+};
 
 // What of a text is converted between code pages.
 constexpr unsigned int codepageLimit = 254;
@@ -98,7 +97,7 @@ const SimAccountFactory::Shape& SimAccountFactory::shape() {
         getSimAccountInstances,
         &SimAccount::getName,
         SameKey::Replaces,
-        keysOf,
+        keys,
         table,
         std::size(table),
         1,

@@ -42,16 +42,16 @@ inline void addReferenceKey(CMPIObjectPath* own, const char* role, CMPIObjectPat
     own->ft->addKey(own, role, &value, CMPI_ref);
 }
 
-// Visits every pair of far and near paths, far ones outermost, until `visit(far, near)`
-// returns false. `noNear` is said when the near paths cannot be had. Returns false when a
-// step failed; `status` is then what it left.
-template <class Association, class Visit>
-bool forEachPair(const MarkerLines& lines, const AssociationRequest& request, const char* noNear,
+// Visits every pair of a far path and one of the factory's near paths, far ones outermost,
+// until `visit(far, near)` returns false. `noNear` is said when the near paths cannot be had.
+// Returns false when a step failed; `status` is then what it left.
+template <class Factory, class Visit>
+bool forEachPair(const MarkerLines& lines, const AssociationRequest& request,
+                 const AssociationShape& shape, Factory& factory, const char* noNear,
                  CMPIStatus* status, Visit visit) {
-    typename Association::Factory factory(true, false);
-    const AssociationShape& shape = Association::shape();
+    // Only its class and namespace count: it names a class to enumerate, not an object.
     CMPIObjectPath* farClass =
-        newPath(request.broker, request.ref, shape.farClass, nullptr, status);
+        newBarePath(request.broker, request.ref, shape.farClass, nullptr, status);
     if (farClass == nullptr) {
         lines.failed(shape.farPathFailed);
         return false;
@@ -100,6 +100,7 @@ template <class Association>
 bool buildInstances(const MarkerLines& lines, const AssociationRequest& request,
                     std::vector<CMPIInstance*>& instances, CMPIStatus* status) {
     const AssociationShape& shape = Association::shape();
+    typename Association::Factory factory(true, false);
     const auto build = [&](CMPIObjectPath* far, CMPIObjectPath* near) {
         CMPIObjectPath* own = ownPath<Association>(lines, request, shape.ownPathFailed, status);
         if (own == nullptr) {
@@ -115,21 +116,18 @@ bool buildInstances(const MarkerLines& lines, const AssociationRequest& request,
         }
         return true;
     };
-    return forEachPair<Association>(lines, request, association::noNearPaths, status, build);
+    return forEachPair(lines, request, shape, factory, association::noNearPaths, status, build);
 }
 
-// The frame of every operation: markers, the barrier, and the end of the normal path. The
-// body returns false when a step failed.
+// The frame of every operation: the entry marker and the barrier. The body calls finish() at
+// the end of its normal path, and does not when a step failed.
 template <class Body>
 CMPIStatus associationOperation(const MarkerLines& lines, const AssociationRequest& request,
                                 Body body) {
     return guarded(request.broker, lines.unit(), lines.site(), [&] {
         lines.enter();
         CMPIStatus status = succeeded;
-        if (body(&status)) {
-            CMReturnDone(request.result);
-            lines.leave();
-        }
+        body(&status);
         return status;
     });
 }
@@ -138,6 +136,7 @@ template <class Association>
 CMPIStatus enumAssociationNames(const MarkerLines& lines, const AssociationRequest& request) {
     return associationOperation(lines, request, [&](CMPIStatus* status) {
         const AssociationShape& shape = Association::shape();
+        typename Association::Factory factory(true, false);
         const auto returnName = [&](CMPIObjectPath* far, CMPIObjectPath* near) {
             CMPIObjectPath* own = ownPath<Association>(lines, request, shape.ownNameFailed, status);
             if (own == nullptr) {
@@ -148,8 +147,10 @@ CMPIStatus enumAssociationNames(const MarkerLines& lines, const AssociationReque
             CMReturnObjectPath(request.result, own);
             return true;
         };
-        return forEachPair<Association>(lines, request, association::noNearNames, status,
-                                        returnName);
+        if (forEachPair(lines, request, shape, factory, association::noNearNames, status,
+                        returnName)) {
+            finish(lines, request.result);
+        }
     });
 }
 
@@ -157,31 +158,31 @@ template <class Association>
 CMPIStatus enumAssociations(const MarkerLines& lines, const AssociationRequest& request) {
     return associationOperation(lines, request, [&](CMPIStatus* status) {
         std::vector<CMPIInstance*> instances;
-        if (!Association::build(request.ref, request.properties, request.context, instances,
-                                status)) {
-            return false;
+        if (Association::build(request.ref, request.properties, request.context, instances,
+                               status)) {
+            deliver(request.result, instances);
+            finish(lines, request.result);
         }
-        deliver(request.result, instances);
-        return true;
     });
 }
 
 template <class Association>
 CMPIStatus getAssociation(const MarkerLines& lines, const AssociationRequest& request) {
     return associationOperation(lines, request, [&](CMPIStatus* status) {
-        if (!hasKeys(request.ref)) {
+        if (!hasKeys(request.ref, status)) {
             lines.failed(keyMissingText);
-            return true;
+            finish(lines, request.result);
+            return;
         }
         std::vector<CMPIInstance*> instances;
         if (!Association::build(request.ref, request.properties, request.context, instances,
                                 status)) {
-            return false;
+            return;
         }
-        if (CMPIInstance* found = findByPath(request.ref, instances); found != nullptr) {
+        if (CMPIInstance* found = findByPath(request.ref, instances, status); found != nullptr) {
             CMReturnInstance(request.result, found);
         }
-        return true;
+        finish(lines, request.result);
     });
 }
 

@@ -19,6 +19,15 @@ inline Target targetOf(const AssociationShape& shape, const CMPIObjectPath* targ
     return std::strcmp(name, shape.nearClass) == 0 ? Target::Near : Target::None;
 }
 
+// The same end, or none where the request's result class excludes the class there.
+inline Target admitted(const AssociationShape& shape, Target end, const char* resultClass) {
+    const bool far = end == Target::Far;
+    return admitsResultClass(resultClass, far ? shape.farClass : shape.nearClass,
+                             far ? shape.farParent : shape.nearParent)
+               ? end
+               : Target::None;
+}
+
 // Says so when there is no target path.
 inline bool targetMissing(const MarkerLines& lines, const CMPIObjectPath* target,
                           const char* text) {
@@ -76,16 +85,19 @@ bool returnNearInstances(const MarkerLines& lines, const AssociationRequest& req
     return true;
 }
 
-// The near paths for a request; false, with `failedText` said, when they cannot be had.
-template <class Factory>
-bool collectNearPaths(const MarkerLines& lines, const AssociationRequest& request,
-                      const CMPIObjectPath* ref, Factory& factory, const char* failedText,
-                      std::vector<CMPIObjectPath*>& paths, CMPIStatus* status) {
+// Visits the near paths, placed like `ref`; false, with `failedText` said, when they cannot be
+// had.
+template <class Factory, class Visit>
+bool forEachNearPath(const MarkerLines& lines, const AssociationRequest& request,
+                     const CMPIObjectPath* ref, Factory& factory, const char* failedText,
+                     CMPIStatus* status, Visit visit) {
+    std::vector<CMPIObjectPath*> paths;
     paths.reserve(factory.getNumberOfInstances());
     if (factory.allPaths(request.broker, ref, paths, status) != 0) {
         lines.failed(failedText);
         return false;
     }
+    forEachCounted(paths, visit);
     return true;
 }
 
@@ -99,19 +111,15 @@ CMPIStatus associators(const MarkerLines& lines, const AssociationRequest& reque
         const CMPIObjectPath* target = utility.get_assoc_targetClass_ObjectPath(
             request.broker, request.ref, assocClass, resultClass, status);
         if (targetMissing(lines, target, "Object Path is NULL in Associators.")) {
-            return false;
+            return;
         }
-        switch (targetOf(shape, target, status)) {
-        case Target::Far:
-            return !admitsResultClass(resultClass, shape.farClass, shape.farParent) ||
-                   returnFarInstances(lines, request, target, status);
-        case Target::Near:
-            return !admitsResultClass(resultClass, shape.nearClass, shape.nearParent) ||
-                   returnNearInstances(lines, request, target, factory, status);
-        case Target::None:
-            break;
+        const Target end = admitted(shape, targetOf(shape, target, status), resultClass);
+        if ((end == Target::Far && !returnFarInstances(lines, request, target, status)) ||
+            (end == Target::Near &&
+             !returnNearInstances(lines, request, target, factory, status))) {
+            return;
         }
-        return true;
+        finish(lines, request.result);
     });
 }
 
@@ -125,25 +133,19 @@ CMPIStatus associatorNames(const MarkerLines& lines, const AssociationRequest& r
         const CMPIObjectPath* target = utility.get_assoc_targetClass_ObjectPath(
             request.broker, request.ref, assocClass, resultClass, status);
         if (targetMissing(lines, target, "Object Path is NULL in AssociatorNames.")) {
-            return false;
+            return;
         }
         const auto returnPath = [&](CMPIObjectPath* path) {
             CMReturnObjectPath(request.result, path);
         };
-        const Target end = targetOf(shape, target, status);
-        if (end == Target::Far && admitsResultClass(resultClass, shape.farClass, shape.farParent)) {
-            return forEachFarPath(lines, request, target, status, returnPath);
+        const Target end = admitted(shape, targetOf(shape, target, status), resultClass);
+        if ((end == Target::Far && !forEachFarPath(lines, request, target, status, returnPath)) ||
+            (end == Target::Near &&
+             !forEachNearPath(lines, request, target, factory, association::noNearAssociatorNames,
+                              status, returnPath))) {
+            return;
         }
-        if (end == Target::Near &&
-            admitsResultClass(resultClass, shape.nearClass, shape.nearParent)) {
-            std::vector<CMPIObjectPath*> paths;
-            if (!collectNearPaths(lines, request, target, factory,
-                                  association::noNearAssociatorNames, paths, status)) {
-                return false;
-            }
-            forEachCounted(paths, returnPath);
-        }
-        return true;
+        finish(lines, request.result);
     });
 }
 
@@ -157,13 +159,10 @@ CMPIStatus eachReference(const MarkerLines& lines, const AssociationRequest& req
         typename Association::Utility utility;
         const CMPIObjectPath* target = utility.get_assoc_targetClass_ObjectPath(
             request.broker, request.ref, shape.className, resultClass, status);
-        if (targetMissing(lines, target, missingText)) {
-            return false;
-        }
-        CMPIObjectPath* own =
+        const CMPIObjectPath* own =
             newPath(request.broker, request.ref, shape.className, nullptr, status);
-        if (targetMissing(lines, own, missingText)) {
-            return false;
+        if (targetMissing(lines, target, missingText) || targetMissing(lines, own, missingText)) {
+            return;
         }
         const auto giveOne = [&](const CMPIObjectPath* far, const CMPIObjectPath* near) {
             CMPIInstance* instance = CMNewInstance(request.broker, own, status);
@@ -174,24 +173,22 @@ CMPIStatus eachReference(const MarkerLines& lines, const AssociationRequest& req
             }
         };
         const Target end = targetOf(shape, target, status);
-        if (end == Target::Far) {
-            return forEachFarPath(lines, request, target, status,
-                                  [&](CMPIObjectPath* far) { giveOne(far, request.ref); });
-        }
         if (end == Target::Near) {
             typename Association::Factory factory(true, false);
-            std::vector<CMPIObjectPath*> paths;
-            if (!collectNearPaths(lines, request, request.ref, factory,
-                                  association::noNearReferences, paths, status)) {
-                return false;
-            }
-            forEachCounted(paths, [&](CMPIObjectPath* near) {
-                setNameSpaceFrom(near, request.ref, status);
-                near->ft->setHostname(near, getSystemName().c_str());
+            const auto giveNear = [&](CMPIObjectPath* near) {
+                place(near, request.ref, status);
                 giveOne(request.ref, near);
-            });
+            };
+            if (forEachNearPath(lines, request, request.ref, factory, association::noNearReferences,
+                                status, giveNear)) {
+                finish(lines, request.result);
+            }
+            return;
         }
-        return true;
+        const auto giveFar = [&](CMPIObjectPath* far) { giveOne(far, request.ref); };
+        if (end == Target::None || forEachFarPath(lines, request, target, status, giveFar)) {
+            finish(lines, request.result);
+        }
     });
 }
 

@@ -44,18 +44,22 @@ void traceToBroker(const CMPIBroker* broker, unsigned int level, const char* com
     }
 }
 
-CMPIObjectPath* newPath(const CMPIBroker* broker, const CMPIObjectPath* ref, const char* className,
-                        CMPIStatus* lookup, CMPIStatus* creation) {
+CMPIObjectPath* newBarePath(const CMPIBroker* broker, const CMPIObjectPath* ref,
+                            const char* className, CMPIStatus* lookup, CMPIStatus* creation) {
     if (broker == nullptr) {
         return nullptr;
     }
     const char* nameSpace = nameSpaceOf(ref, lookup);
     CMPIObjectPath* path = broker->eft->newObjectPath(broker, nameSpace, className, creation);
-    if (isNull(path)) {
-        return nullptr;
+    return isNull(path) ? nullptr : path;
+}
+
+CMPIObjectPath* newPath(const CMPIBroker* broker, const CMPIObjectPath* ref, const char* className,
+                        CMPIStatus* lookup, CMPIStatus* creation) {
+    CMPIObjectPath* path = newBarePath(broker, ref, className, lookup, creation);
+    if (path != nullptr) {
+        place(path, ref, lookup);
     }
-    path->ft->setNameSpace(path, nameSpace);
-    path->ft->setHostname(path, getSystemName().c_str());
     return path;
 }
 
@@ -63,10 +67,13 @@ void setNameSpaceFrom(CMPIObjectPath* path, const CMPIObjectPath* ref, CMPIStatu
     path->ft->setNameSpace(path, nameSpaceOf(ref, status));
 }
 
-void addKeys(CMPIObjectPath* path, const std::vector<KeyText>& keys) {
-    for (const KeyText& key : keys) {
-        path->ft->addKey(path, key.name, charsValue(key.text.c_str()), CMPI_chars);
-    }
+void place(CMPIObjectPath* path, const CMPIObjectPath* ref, CMPIStatus* status) {
+    setNameSpaceFrom(path, ref, status);
+    path->ft->setHostname(path, getSystemName().c_str());
+}
+
+void addKey(CMPIObjectPath* path, const char* name, const std::string& text) {
+    path->ft->addKey(path, name, charsValue(text.c_str()), CMPI_chars);
 }
 
 } // namespace SimpleIdentityManagementProvider

@@ -7,7 +7,6 @@
 #include <cmpimacs.h>
 
 #include <string>
-#include <vector>
 
 namespace Tesk {
 namespace SimpleIdentityManagementProvider {
@@ -35,27 +34,26 @@ CMPIStatus makeStatus(const CMPIBroker* broker, CMPIrc code, const char* text);
 // Gives `status`, unless it is null, that code and text.
 void setStatus(CMPIStatus* status, const CMPIBroker* broker, CMPIrc code, const char* text);
 
-// One key of a class: its name and its text.
-struct KeyText {
-    const char* name;
-    std::string text;
-};
-
 // Sends a line to the broker's own trace, if there is a broker.
 void traceToBroker(const CMPIBroker* broker, unsigned int level, const char* component,
                    const char* text);
 
-// A new path of `className` in the namespace of `ref`, with this system as its host. Null
-// when the broker makes none. Both status arguments may be null: `lookup` receives the
-// status of reading the namespace, `creation` that of making the path.
+// A new path of `className` in the namespace of `ref`, and nothing else. Null when the broker
+// makes none. Both status arguments may be null: `lookup` receives the status of reading the
+// namespace, `creation` that of making the path.
+CMPIObjectPath* newBarePath(const CMPIBroker* broker, const CMPIObjectPath* ref,
+                            const char* className, CMPIStatus* lookup, CMPIStatus* creation);
+
+// The same, placed like `ref` and on this system.
 CMPIObjectPath* newPath(const CMPIBroker* broker, const CMPIObjectPath* ref, const char* className,
                         CMPIStatus* lookup, CMPIStatus* creation);
 
-// Gives `path` the namespace of `ref`.
+// Gives `path` the namespace of `ref`; place() gives it this system as its host, too.
 void setNameSpaceFrom(CMPIObjectPath* path, const CMPIObjectPath* ref, CMPIStatus* status);
+void place(CMPIObjectPath* path, const CMPIObjectPath* ref, CMPIStatus* status);
 
-// Adds keys of type CMPI_chars to a path.
-void addKeys(CMPIObjectPath* path, const std::vector<KeyText>& keys);
+// Adds a key of type CMPI_chars to a path.
+void addKey(CMPIObjectPath* path, const char* name, const std::string& text);
 
 // The argument that CMPI's setters take for a value of type CMPI_chars: the text itself.
 inline const CMPIValue* charsValue(const char* text) {

@@ -3,6 +3,7 @@
 #pragma once
 
 #include "InstanceWriter.h"
+#include "Keys.h"
 
 #include <UnitTrace.h>
 
@@ -34,8 +35,8 @@ template <class Record, class Factory> struct ClassShape {
     std::string (Record::*key)();               // by which records are mapped and looked up
     SameKey sameKey;
 
-    std::vector<KeyText> (*keysOf)(Record& record); // in the order in which they are set
-    const PropertyRow<Record, Factory>* rows;       // the other properties, in that order too
+    KeyTable<Record> keys;
+    const PropertyRow<Record, Factory>* rows; // the other properties, in the order of setting
     std::size_t rowCount;
 
     unsigned int emptyLevel;     // of the broker's trace when there is no instance

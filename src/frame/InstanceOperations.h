@@ -38,8 +38,15 @@ inline CMPIData keyOf(const CMPIObjectPath* path, const char* name) {
     return path->ft->getKey(path, name, nullptr);
 }
 
-inline bool hasKeys(const CMPIObjectPath* path) {
-    return !isNull(path) && path->ft->getKeyCount(path, nullptr) != 0;
+inline bool hasKeys(const CMPIObjectPath* path, CMPIStatus* status) {
+    return !isNull(path) && path->ft->getKeyCount(path, status) != 0;
+}
+
+// The end of an operation's normal path. It comes while what the operation has built is still
+// there: a factory tells of its end after the operation has told of its own.
+template <class Lines> void finish(const Lines& lines, const CMPIResult* result) {
+    CMReturnDone(result);
+    lines.leave();
 }
 
 // Collects every instance; false, with the failure told, when the collector fails.
@@ -70,10 +77,38 @@ CMPIStatus enumInstanceNames(Lines lines, const InstanceRequest& request) {
             return status;
         }
         deliver(request.result, request.ref, paths, &status);
-        CMReturnDone(request.result);
-        lines.leave();
+        finish(lines, request.result);
         return status;
     });
+}
+
+// Each of these returns instances and finishes the operation; when the factory fails, it says
+// so and leaves the operation unfinished.
+
+// Every instance.
+template <class Class, class Lines>
+void returnAll(const Lines& lines, const InstanceRequest& request, CMPIStatus* status) {
+    std::vector<CMPIInstance*> instances;
+    typename Class::Factory factory(Class::firstFlag, !Class::firstFlag);
+    if (collectAll<Class>(lines, request, factory, instances, status)) {
+        deliver(request.result, instances);
+        finish(lines, request.result);
+    }
+}
+
+// The instance of that key's text, if there is one.
+template <class Class, class Lines>
+void returnOne(const Lines& lines, const InstanceRequest& request, CMPIString* key,
+               CMPIStatus* status) {
+    std::vector<CMPIInstance*> instances;
+    typename Class::Factory factory(Class::firstFlag, !Class::firstFlag);
+    instances.reserve(factory.getNumberOfInstances());
+    if (factory.one(request.broker, request.ref, key, request.properties, instances, status) != 0) {
+        lines.failed(Class::oneFailed);
+        return;
+    }
+    deliver(request.result, instances);
+    finish(lines, request.result);
 }
 
 template <class Class, class Lines>
@@ -82,52 +117,19 @@ CMPIStatus enumInstances(Lines lines, const InstanceRequest& request) {
         lines.enter();
         Class::refresh();
         CMPIStatus status = succeeded;
-        std::vector<CMPIInstance*> instances;
-        typename Class::Factory factory(Class::firstFlag, !Class::firstFlag);
-        if (!collectAll<Class>(lines, request, factory, instances, &status)) {
-            return status;
-        }
-        deliver(request.result, instances);
-        CMReturnDone(request.result);
-        lines.leave();
+        returnAll<Class>(lines, request, &status);
         return status;
     });
 }
 
-// Returns the instance of that key's text, if there is one; false when the factory fails.
-template <class Class, class Lines>
-bool returnOne(const Lines& lines, const InstanceRequest& request, CMPIString* key,
-               CMPIStatus* status) {
-    typename Class::Factory factory(Class::firstFlag, !Class::firstFlag);
-    std::vector<CMPIInstance*> instances;
-    instances.reserve(factory.getNumberOfInstances());
-    if (factory.one(request.broker, request.ref, key, request.properties, instances, status) != 0) {
-        lines.failed(Class::oneFailed);
-        return false;
-    }
-    deliver(request.result, instances);
-    return true;
-}
-
-// Returns every instance; false when the factory fails.
-template <class Class, class Lines>
-bool returnAll(const Lines& lines, const InstanceRequest& request, CMPIStatus* status) {
-    std::vector<CMPIInstance*> instances;
-    typename Class::Factory factory(Class::firstFlag, !Class::firstFlag);
-    if (!collectAll<Class>(lines, request, factory, instances, status)) {
-        return false;
-    }
-    deliver(request.result, instances);
-    return true;
-}
-
-// The first of the instances whose own path equals the request's, or null.
+// The first of the instances whose own path equals the request's, or null. `status` receives
+// that of the last path looked at.
 inline CMPIInstance* findByPath(const CMPIObjectPath* wanted,
-                                const std::vector<CMPIInstance*>& instances) {
+                                const std::vector<CMPIInstance*>& instances, CMPIStatus* status) {
     CMPIInstance* found = nullptr;
     forEachCounted(instances, [&](CMPIInstance* instance) {
         if (found == nullptr) {
-            const CMPIObjectPath* path = instance->ft->getObjectPath(instance, nullptr);
+            const CMPIObjectPath* path = instance->ft->getObjectPath(instance, status);
             if (!isNull(path) && isObjPathsEqual(wanted, path, false)) {
                 found = instance;
             }
@@ -136,18 +138,18 @@ inline CMPIInstance* findByPath(const CMPIObjectPath* wanted,
     return found;
 }
 
-// Returns the first instance whose path equals the request's; false when the factory fails.
+// As returnAll, of the first instance whose path equals the request's.
 template <class Class, class Lines>
-bool returnSamePath(const Lines& lines, const InstanceRequest& request, CMPIStatus* status) {
+void returnSamePath(const Lines& lines, const InstanceRequest& request, CMPIStatus* status) {
     std::vector<CMPIInstance*> instances;
     typename Class::Factory factory(Class::firstFlag, !Class::firstFlag);
     if (!collectAll<Class>(lines, request, factory, instances, status)) {
-        return false;
+        return;
     }
-    if (CMPIInstance* found = findByPath(request.ref, instances); found != nullptr) {
+    if (CMPIInstance* found = findByPath(request.ref, instances, status); found != nullptr) {
         CMReturnInstance(request.result, found);
     }
-    return true;
+    finish(lines, request.result);
 }
 
 // GetInstance by the class's key, or, where the request lacks it, of every instance. A
@@ -158,20 +160,17 @@ CMPIStatus getInstanceByKeyOrAll(Lines lines, const InstanceRequest& request) {
         lines.enter();
         Class::refresh();
         CMPIStatus status = succeeded;
-        if (!hasKeys(request.ref)) {
+        if (!hasKeys(request.ref, &status)) {
             status = makeStatus(request.broker, CMPI_RC_ERR_FAILED, keyMissingText);
             traceToBroker(request.broker, 2, Class::component, keyMissingText);
             return status;
         }
         const CMPIData key = keyOf(request.ref, Class::key);
-        const bool done = holdsText(key)
-                              ? returnOne<Class>(lines, request, key.value.string, &status)
-                              : returnAll<Class>(lines, request, &status);
-        if (!done) {
-            return status;
+        if (holdsText(key)) {
+            returnOne<Class>(lines, request, key.value.string, &status);
+        } else {
+            returnAll<Class>(lines, request, &status);
         }
-        CMReturnDone(request.result);
-        lines.leave();
         return status;
     });
 }
@@ -184,19 +183,17 @@ CMPIStatus getInstanceByKeyOrPath(Lines lines, const InstanceRequest& request) {
         lines.enter();
         Class::refresh();
         CMPIStatus status = succeeded;
-        if (!hasKeys(request.ref)) {
+        if (!hasKeys(request.ref, &status)) {
             lines.failed(keyMissingText);
-        } else {
-            const CMPIData key = keyOf(request.ref, Class::key);
-            const bool done = holdsText(key)
-                                  ? returnOne<Class>(lines, request, key.value.string, &status)
-                                  : returnSamePath<Class>(lines, request, &status);
-            if (!done) {
-                return status;
-            }
+            finish(lines, request.result);
+            return status;
         }
-        CMReturnDone(request.result);
-        lines.leave();
+        const CMPIData key = keyOf(request.ref, Class::key);
+        if (holdsText(key)) {
+            returnOne<Class>(lines, request, key.value.string, &status);
+        } else {
+            returnSamePath<Class>(lines, request, &status);
+        }
         return status;
     });
 }

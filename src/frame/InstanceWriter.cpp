@@ -39,19 +39,6 @@ CMPIInstance* newInstance(const CMPIBroker* broker, const CMPIObjectPath* ref,
     return isNull(instance) ? nullptr : instance;
 }
 
-void setKeys(CMPIInstance* instance, const char** properties, const std::vector<KeyText>& keys) {
-    std::vector<const char*> names;
-    names.reserve(keys.size() + 1);
-    for (const KeyText& key : keys) {
-        names.push_back(key.name);
-    }
-    names.push_back(nullptr);
-    instance->ft->setPropertyFilter(instance, properties, names.data());
-    for (const KeyText& key : keys) {
-        instance->ft->setProperty(instance, key.name, charsValue(key.text.c_str()), CMPI_chars);
-    }
-}
-
 void InstanceWriter::set(const char* name, const CMPIValue& value, CMPIType type) const {
     instance_->ft->setProperty(instance_, name, &value, type);
 }

@@ -33,9 +33,6 @@ private:
 CMPIInstance* newInstance(const CMPIBroker* broker, const CMPIObjectPath* ref,
                           const char* className, CMPIStatus* lookup);
 
-// Hands the requested list and the class's keys to the broker's own filter, then sets the keys.
-void setKeys(CMPIInstance* instance, const char** properties, const std::vector<KeyText>& keys);
-
 // The localised caption that several classes share.
 std::string localisedCaption();
 

@@ -73,7 +73,7 @@ public:
         CMPIInstance* instance =
             newInstance(broker, ref, shape().className, shape().reportsLookup ? rc : nullptr);
         if (instance != nullptr) {
-            setKeys(instance, properties, shape().keysOf(record));
+            shape().keys.setIn(instance, properties, record);
             setProperties(InstanceWriter(broker, instance, rc), filter, record);
         }
         return call.leave(instance, at(Derived::names.make));
@@ -161,7 +161,7 @@ private:
                 traceToBroker(broker, 2, shape().component, shape().pathFailedTrace);
                 return creationFailed;
             }
-            addKeys(path, shape().keysOf(record));
+            shape().keys.addTo(path, record);
             paths.push_back(path);
         }
         return collected;

@@ -1,5 +1,7 @@
 #include "SimGroup.h"
 
+#include "../store/RecordLoader.h"
+
 #include <ProviderException.h>
 #include <UnitTrace.h>
 
@@ -23,8 +25,7 @@ std::string joined(const std::vector<std::string>& members) {
     return text;
 }
 
-SimGroup readGroup(Instrumentation& node) {
-    SimGroup group;
+void fillGroup(Instrumentation& node, SimGroup& group) {
     std::string name;
     if (node.getProperty(NodeLexicon::Name, name)) {
         if (group.setName(name)) {
@@ -38,7 +39,6 @@ SimGroup readGroup(Instrumentation& node) {
     if (node.getProperty(NodeLexicon::GroupMembers, members)) {
         group.setMembers(joined(members));
     }
-    return group;
 }
 
 } // namespace
@@ -64,10 +64,7 @@ bool SimGroup::setMembers(std::string member) {
 bool setVector(std::vector<SimGroup>& vectSimGroup, Tesk::Instrumentation& instrumentation) {
     CallTrace call(unit, parameters(" vectSimGroup=", &vectSimGroup,
                                     " instrumentation=", static_cast<bool>(instrumentation)));
-    while (instrumentation) {
-        vectSimGroup.push_back(readGroup(instrumentation));
-        ++instrumentation;
-    }
+    appendRecords(instrumentation, vectSimGroup, fillGroup);
     return call.leave(false);
 }
 

@@ -13,9 +13,10 @@ namespace {
 const std::string loggerSimGroupObjFactory("Corvane.SimpleIdentityManagementProvider");
 const UnitTrace unit(loggerSimGroupObjFactory, "SimGroupObjFactory");
 
-std::vector<KeyText> keysOf(SimGroup& group) {
-    return {{"CreationClassName", GroupClass}, {"Name", group.getName()}};
-}
+constexpr KeyRow<SimGroup> keys[] = {
+    {"CreationClassName", key::fixed<GroupClass>},
+    {"Name", key::text<&SimGroup::getName>},
+};
 
 using namespace property;
 
@@ -36,7 +37,7 @@ const SimGroupFactory::Shape& SimGroupFactory::shape() {
         getSimGroupInstances,
         &SimGroup::getName,
         SameKey::IsDropped,
-        keysOf,
+        keys,
         table,
         std::size(table),
         1,

@@ -11,9 +11,9 @@ namespace {
 const std::string loggerSimIdentityObjFactory("Corvane.SimIdentityObjFactory");
 const UnitTrace unit(loggerSimIdentityObjFactory, "SimIdentityObjFactory");
 
-std::vector<KeyText> keysOf(SimIdentity& identity) {
-    return {{"InstanceID", identity.getInstanceID()}};
-}
+constexpr KeyRow<SimIdentity> keys[] = {
+    {"InstanceID", key::text<&SimIdentity::getInstanceID>},
+};
 
 bool loadIdentity(std::vector<SimIdentity>& records) {
     return getSimIdentityInstances(records) != 0;
@@ -33,7 +33,7 @@ const SimIdentityFactory::Shape& SimIdentityFactory::shape() {
         loadIdentity,
         &SimIdentity::getInstanceID,
         SameKey::IsDropped,
-        keysOf,
+        keys,
         table,
         std::size(table),
         2,

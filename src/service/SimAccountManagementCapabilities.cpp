@@ -1,6 +1,7 @@
 #include "SimAccountManagementCapabilities.h"
 
-#include <Instrumentation.h>
+#include "../store/RecordLoader.h"
+
 #include <ProviderException.h>
 
 #include <iostream>
@@ -13,8 +14,7 @@ namespace {
 constexpr std::uint16_t operations[] = {2, 3, 4}; // create, modify, delete
 constexpr std::uint16_t states[] = {2, 3, 6};     // enabled, disabled, offline
 
-SimAccountManagementCapabilities readCapabilities(Instrumentation& node) {
-    SimAccountManagementCapabilities capabilities;
+void fillCapabilities(Instrumentation& node, SimAccountManagementCapabilities& capabilities) {
     const std::string id =
         "SimAccountManagementCapabilities_" + node.convertPathToString(node.getPathToNode());
     if (!capabilities.setInstanceID(id)) {
@@ -23,7 +23,6 @@ SimAccountManagementCapabilities readCapabilities(Instrumentation& node) {
     if (!capabilities.setElementName(id)) {
         throw ProviderException("Failed while setting Element Name.");
     }
-    return capabilities;
 }
 
 } // namespace
@@ -63,9 +62,8 @@ bool getSimAccountManagementCapabilitiesInstances(
     try {
         Instrumentation cursor;
         cursor.selectNode(NodeLexicon::AccountServiceRoot);
-        while (cursor) {
-            vectSimAccountManagementCapabilities.push_back(readCapabilities(cursor));
-            ++cursor;
+        if (cursor) {
+            appendRecords(cursor, vectSimAccountManagementCapabilities, fillCapabilities);
         }
     } catch (const std::exception& failure) {
         std::cerr << failure.what() << std::endl;

@@ -20,9 +20,9 @@ using Capabilities = SimAccountManagementCapabilities;
 using Factory = SimAccountManagementCapabilitiesFactory;
 using namespace property;
 
-std::vector<KeyText> keysOf(Capabilities& capabilities) {
-    return {{"InstanceID", capabilities.getInstanceID()}};
-}
+constexpr KeyRow<Capabilities> keys[] = {
+    {"InstanceID", key::text<&Capabilities::getInstanceID>},
+};
 
 // The texts for an array that the broker cannot make. The two differ in one letter.
 struct ArrayTexts {
@@ -62,7 +62,7 @@ const Factory::Shape& SimAccountManagementCapabilitiesFactory::shape() {
         getSimAccountManagementCapabilitiesInstances,
         &Capabilities::getInstanceID,
         SameKey::Replaces,
-        keysOf,
+        keys,
         table,
         std::size(table),
         2,

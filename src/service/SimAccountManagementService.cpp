@@ -1,5 +1,7 @@
 #include "SimAccountManagementService.h"
 
+#include "../store/RecordLoader.h"
+
 #include <ProviderException.h>
 #include <UnitTrace.h>
 
@@ -30,8 +32,7 @@ void require(bool refused, const char* message) {
     }
 }
 
-SimAccountManagementService readService(Instrumentation& node) {
-    SimAccountManagementService service;
+void fillService(Instrumentation& node, SimAccountManagementService& service) {
     const std::string name =
         "SimAccountManagementService_" + node.convertPathToString(node.getPathToNode());
     require(service.setName(name), "Failed while setting Name");
@@ -39,7 +40,6 @@ SimAccountManagementService readService(Instrumentation& node) {
             "Failed while setting RequestedState");
     require(service.setEnabledState(enabledStateEnabled), "Failed while setting EnabledState");
     require(service.setElementName(name), "Failed while setting ElementName");
-    return service;
 }
 
 } // namespace
@@ -71,10 +71,7 @@ bool SimAccountManagementService::setEnabledState(unsigned short enabledState) {
 bool setSimAccountManagementServiceVector(
     std::vector<SimAccountManagementService>& vectSimAccountManagementService,
     Tesk::Instrumentation& instrumentation) {
-    while (instrumentation) {
-        vectSimAccountManagementService.push_back(readService(instrumentation));
-        ++instrumentation;
-    }
+    appendRecords(instrumentation, vectSimAccountManagementService, fillService);
     return false;
 }
 

@@ -1,7 +1,6 @@
 #include "SimAccountManagementServiceObjFactory.h"
 
 #include <ClassNames.h>
-#include <platform/TeskCommon.h>
 
 #include <iterator>
 
@@ -14,15 +13,15 @@ const std::string
 const UnitTrace unit(loggerSimAccountManagementServiceObjFactory,
                      "SimAccountManagementServiceObjFactory");
 
-std::vector<KeyText> keysOf(SimAccountManagementService& service) {
-    return {{"SystemCreationClassName", ComputerSystemClass},
-            {"SystemName", getSystemName()},
-            {"CreationClassName", accountManagementServiceClass},
-            {"Name", service.getName()}};
-}
-
 using Service = SimAccountManagementService;
 using namespace property;
+
+constexpr KeyRow<Service> keys[] = {
+    {"SystemCreationClassName", key::fixed<ComputerSystemClass>},
+    {"SystemName", key::systemName},
+    {"CreationClassName", key::fixed<accountManagementServiceClass>},
+    {"Name", key::text<&Service::getName>},
+};
 
 constexpr PropertyRow<Service, SimAccountManagementServiceFactory> table[] = {
     {"Caption", caption},
@@ -42,7 +41,7 @@ const SimAccountManagementServiceFactory::Shape& SimAccountManagementServiceFact
         getSimAccountManagementServiceInstances,
         &Service::getName,
         SameKey::Replaces,
-        keysOf,
+        keys,
         table,
         std::size(table),
         1,

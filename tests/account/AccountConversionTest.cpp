@@ -21,6 +21,10 @@ struct TimeCase {
     const char* date;
 };
 
+void PrintTo(const TimeCase& time, std::ostream* stream) {
+    *stream << testing::PrintToString(time.given);
+}
+
 class TimeText : public testing::TestWithParam<TimeCase> {};
 
 TEST_P(TimeText, Becomes_the_first_14_digits_in_UTC_or_nothing) {

@@ -7,6 +7,7 @@ AccountFixture::AccountFixture()
       methods_(ProviderLibrary::instance().methodMI("SimAccountProvider", broker_.get())),
       classPath_(broker_.makePath(accountNameSpace, "ZANTH_Account")) {
     platform_.reset();
+    broker_.observeCalls([this](const std::string& call) { platform_.note("broker: " + call); });
 }
 
 AccountFixture::~AccountFixture() {

@@ -264,6 +264,10 @@ struct GroupIdCase {
     unsigned int value;
 };
 
+void PrintTo(const GroupIdCase& test, std::ostream* stream) {
+    *stream << testing::PrintToString(test.text);
+}
+
 class GroupIdText : public AccountLoader, public testing::WithParamInterface<GroupIdCase> {};
 
 TEST_P(GroupIdText, Is_read_as_a_decimal_number) {

@@ -102,6 +102,8 @@ struct TextField {
     const char* variable;
 };
 
+void PrintTo(const TextField& field, std::ostream* stream) { *stream << field.getter; }
+
 class TracedText : public AccountRecord, public testing::WithParamInterface<TextField> {};
 
 TEST_P(TracedText, Is_stored_and_traced) {
@@ -144,6 +146,8 @@ struct NumberField {
     const char* piece;
     const char* variable;
 };
+
+void PrintTo(const NumberField& field, std::ostream* stream) { *stream << field.getter; }
 
 class TracedNumber : public AccountRecord, public testing::WithParamInterface<NumberField> {};
 
@@ -227,6 +231,8 @@ struct StateCase {
     std::uint16_t enabled;
     bool disabled;
 };
+
+void PrintTo(const StateCase& state, std::ostream* stream) { *stream << "state " << state.store; }
 
 class AccountStates : public AccountRecord, public testing::WithParamInterface<StateCase> {};
 

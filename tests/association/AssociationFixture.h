@@ -34,6 +34,10 @@ struct AssociationCase {
     const char* nearPathStatus;
 };
 
+inline void PrintTo(const AssociationCase* test, std::ostream* stream) {
+    *stream << test->className;
+}
+
 const AssociationCase& hostedService();
 const AssociationCase& elementCapabilities();
 

@@ -212,7 +212,7 @@ protected:
 TEST_P(FailedReferences, There_is_no_target_path) {
     serveTwoAndThree();
     forBoth([&](bool names, const Direction& direction) {
-        broker_.failSlot("newObjectPath", 1, broken_);
+        broker_.failSlot("newObjectPath", 0, broken_);
         expectBroken(run(names, nearPath("/b")));
         expectNothingReturned();
         expectFailedStep(direction.operation, direction.noTarget);

@@ -1,6 +1,7 @@
 // The seven providers and what each registers.
 #pragma once
 
+#include <ostream>
 #include <string>
 #include <vector>
 
@@ -11,6 +12,8 @@ struct ProviderKind {
     bool methods;
     bool associations;
 };
+
+inline void PrintTo(const ProviderKind& kind, std::ostream* stream) { *stream << kind.provider; }
 
 inline const std::vector<ProviderKind>& providerKinds() {
     static const std::vector<ProviderKind> kinds = {

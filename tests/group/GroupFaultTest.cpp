@@ -13,6 +13,8 @@ struct Case {
     bool names = false;
 };
 
+void PrintTo(const Case& test, std::ostream* stream) { *stream << test.name; }
+
 // Too long to be kept without an allocation.
 const std::string longName = "a group with quite a long name";
 

@@ -17,6 +17,8 @@ struct Case {
     Kind kind;
 };
 
+void PrintTo(const Case& test, std::ostream* stream) { *stream << test.name; }
+
 class IdentityFaults : public IdentityFixture, public testing::WithParamInterface<Case> {
 protected:
     Outcome runOne() {

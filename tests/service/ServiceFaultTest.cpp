@@ -13,6 +13,8 @@ struct Case {
     Kind kind;
 };
 
+void PrintTo(const Case& test, std::ostream* stream) { *stream << test.name; }
+
 template <class Fixture> class Faults : public Fixture, public testing::WithParamInterface<Case> {
 protected:
     void prepare() {

@@ -222,6 +222,9 @@ std::optional<Fault> BrokerState::record(const std::string& slot, const std::str
         record_.faultHit = true;
         record_.lines.back() += " [fault]";
     }
+    if (observer) {
+        observer(record_.lines.back());
+    }
     return fault;
 }
 

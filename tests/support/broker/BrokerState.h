@@ -69,6 +69,7 @@ public:
 
     CMPIContext* context = nullptr;
     CMPIResult* result = nullptr;
+    std::function<void(const std::string& line)> observer;
     bool ignoreFilter = false;
     bool refuseTraces = false;
     // by class name in lower case

@@ -127,6 +127,11 @@ std::vector<std::string> RecordingBroker::calls() const {
     return state_->current().lines;
 }
 
+void RecordingBroker::observeCalls(std::function<void(const std::string& line)> observer) {
+    const Lock lock(BrokerState::mutex());
+    state_->observer = std::move(observer);
+}
+
 unsigned RecordingBroker::callCount() const {
     const Lock lock(BrokerState::mutex());
     return static_cast<unsigned>(state_->current().lines.size());

@@ -180,6 +180,8 @@ public:
     // getKey(Name)   getCharPtr   returnInstance   returnData(uint32,0)   returnDone
     // with " [fault]" after those that were made to fail.
     std::vector<std::string> calls() const;
+    // Is given each of these lines at the time of the call, with the broker's lock held.
+    void observeCalls(std::function<void(const std::string& line)> observer);
     unsigned callCount() const;
     // Calls of one slot.
     unsigned callCount(std::string_view slot) const;

@@ -6,6 +6,7 @@ ProviderFixture::ProviderFixture(const ProviderUnderTest& provider)
     : provider_(provider), classPath_(broker_.makePath(requestNameSpace, provider.className)) {
     registerBroker(broker_.get());
     platform_.reset();
+    broker_.observeCalls([this](const std::string& call) { platform_.note("broker: " + call); });
 }
 
 ProviderFixture::~ProviderFixture() {

@@ -140,6 +140,14 @@ std::size_t RecordingPlatform::lineCount() const {
     return locked(*state_, [&] { return state_->records.lineCount; });
 }
 
+std::vector<std::string> RecordingPlatform::events() const {
+    return locked(*state_, [&] { return state_->records.events; });
+}
+
+void RecordingPlatform::note(std::string event) {
+    locked(*state_, [&] { state_->records.note(std::move(event)); });
+}
+
 void RecordingPlatform::setSystemName(std::string name) {
     locked(*state_, [&] { state_->support.systemName = std::move(name); });
 }

@@ -132,6 +132,13 @@ public:
     std::vector<LogLine> lines(Sink sink) const;
     std::size_t lineCount() const; // counts also while recording is off
 
+    // ---- everything in one order ----
+    // What the platform was called for, and what note() added, as it arrived: the message of
+    // each line (of the log alone), "store: selectNode(46)" and "platform: getSystemName()".
+    // The fixtures note each call of their broker as "broker: returnDone".
+    std::vector<std::string> events() const;
+    void note(std::string event);
+
     // ---- support ----
     void setSystemName(std::string name);   // "host.example" otherwise
     void setLanguage(std::string language); // "en" otherwise

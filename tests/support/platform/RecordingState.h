@@ -37,6 +37,7 @@ struct StoreFaultPlan {
 
 struct Records {
     bool on = true;
+    std::vector<std::string> events;
     std::vector<StoreCall> storeCalls;
     std::vector<std::string> commands;
     std::vector<LogLine> lines;
@@ -45,6 +46,16 @@ struct Records {
     std::vector<TextRequest> textRequests;
     std::vector<PathComparison> pathComparisons;
     std::vector<InputCheck> inputChecks;
+
+    void note(std::string event) {
+        if (on) {
+            events.push_back(std::move(event));
+        }
+    }
+    void add(StoreCall call) {
+        note("store: " + call.text);
+        storeCalls.push_back(std::move(call));
+    }
 };
 
 struct Support {

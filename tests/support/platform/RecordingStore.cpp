@@ -51,7 +51,7 @@ public:
 
     template <class Result> void done(Result result) {
         if (state_.records.on) {
-            state_.records.storeCalls.push_back({cursor_, operation_, text_ + result()});
+            state_.records.add({cursor_, operation_, text_ + result()});
         }
     }
     void done() {
@@ -138,8 +138,7 @@ void RecordingPort::close(CursorState& cursor) {
     std::lock_guard lock(state.mutex);
     --state.store.cursorsOpen;
     if (state.records.on) {
-        state.records.storeCalls.push_back(
-            {cursor.number, "~Instrumentation", "~Instrumentation()"});
+        state.records.add({cursor.number, "~Instrumentation", "~Instrumentation()"});
     }
 }
 

@@ -7,6 +7,9 @@ void RecordingPort::line(LogLine line) {
     std::lock_guard lock(state.mutex);
     ++state.records.lineCount;
     if (state.records.on) {
+        if (line.sink == Sink::Log) {
+            state.records.note(line.message);
+        }
         state.records.lines.push_back(std::move(line));
     }
 }
@@ -14,6 +17,7 @@ void RecordingPort::line(LogLine line) {
 std::string RecordingPort::systemName() {
     auto& state = *RecordingPlatform::instance().state_;
     std::lock_guard lock(state.mutex);
+    state.records.note("platform: getSystemName()");
     return state.support.systemName;
 }
 

@@ -80,6 +80,39 @@ std::vector<std::string> withoutDestructors(std::vector<std::string> points,
     return points;
 }
 
+std::vector<std::string> normalisedEvents() {
+    std::vector<std::string> events = RecordingPlatform::instance().events();
+    std::transform(events.begin(), events.end(), events.begin(), normalised);
+    return events;
+}
+
+std::vector<std::string> eventsFromLast(const std::string& first) {
+    const std::vector<std::string> events = normalisedEvents();
+    const auto found = std::find(events.rbegin(), events.rend(), first);
+    if (found == events.rend()) {
+        ADD_FAILURE() << "there is no event '" << first << "'";
+        return {};
+    }
+    return {found.base() - 1, events.end()};
+}
+
+std::vector<std::string> eventsWithin(const std::string& function) {
+    const std::vector<std::string> events = normalisedEvents();
+    const auto line = [&](auto from, const std::string& kind) {
+        const std::string start = kind + ": " + function + "() in ";
+        return std::find_if(from, events.end(), [&](const std::string& event) {
+            return event.compare(0, start.size(), start) == 0;
+        });
+    };
+    const auto entry = line(events.begin(), "ENTERING");
+    const auto exit = line(entry, "EXITING");
+    if (exit == events.end()) {
+        ADD_FAILURE() << function << " was not entered and left";
+        return {};
+    }
+    return {entry + 1, exit};
+}
+
 ExpectedTrace& ExpectedTrace::add(Unit unit, const std::string& function, int level,
                                   const std::string& message) {
     points_.push_back(pointText(unit.component, function, unit.file, level, message));

@@ -42,6 +42,16 @@ std::vector<std::string> tracePoints(const std::vector<LogLine>& lines);
 std::vector<std::string> withoutDestructors(std::vector<std::string> points,
                                             const std::string& destructor);
 
+// The events of the platform, each normalised.
+std::vector<std::string> normalisedEvents();
+
+// The events from the last one that is `first` to the end; none, and a failure, without it.
+std::vector<std::string> eventsFromLast(const std::string& first);
+
+// The events between the first entry line of a function and the exit line that follows it;
+// none, and a failure, where they are not both there.
+std::vector<std::string> eventsWithin(const std::string& function);
+
 // Builds the points of an expected sequence, in order.
 class ExpectedTrace {
 public:

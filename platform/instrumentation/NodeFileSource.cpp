@@ -3,6 +3,10 @@
 #include "NodeFile.h"
 #include "SnapshotBuilder.h"
 
+#ifdef QELO_WITH_COMMANDS
+#include "commands/AdminCommand.h"
+#endif
+
 namespace qelo::nodes {
 
 namespace {
@@ -38,6 +42,13 @@ std::shared_ptr<const Snapshot> NodeFileSource::take() {
         snapshot->failAll("node file " + path_ + " " + *error);
     }
     return snapshot;
+}
+
+bool NodeFileSource::execute(const std::string&, std::string&) {
+#ifdef QELO_WITH_COMMANDS
+    qelo::store::logRefusedCommand("a node file takes no commands");
+#endif
+    return false;
 }
 
 } // namespace qelo::nodes

@@ -1,6 +1,6 @@
 // A node file (NodeFile.h) as source of nodes, for tests, demos and simulated fleets. It is
-// never written: commands are refused. A file that cannot be read, is refused or has more
-// than 64 MiB makes every selection fail.
+// never written: commands are refused, which the log tells. A file that cannot be read, is refused
+// or has more than 64 MiB makes every selection fail.
 #pragma once
 
 #include "Source.h"
@@ -12,6 +12,7 @@ public:
     NodeFileSource(std::string path, Files& files);
 
     std::shared_ptr<const Snapshot> take() override;
+    bool execute(const std::string& command, std::string& status) override;
 
 private:
     std::string path_;

@@ -1,6 +1,7 @@
 #include "platform/CvLogger.h"
 
 #include "logging/AdmissionCache.h"
+#include "logging/LogListener.h"
 #include "logging/LoggerCore.h"
 
 #include <cerrno>
@@ -17,6 +18,14 @@ constexpr const char* kDefaultConfigPath = "/etc/qelosim/logging.conf";
 constexpr std::chrono::seconds kCheckInterval{1};
 
 thread_local AdmissionCache admissionCache;
+
+// Plain data, so that lines of destructors at a thread's very end still find it.
+struct Listening {
+    QeloLogListener listener;
+    void* context;
+};
+
+thread_local Listening listening{nullptr, nullptr};
 
 // A caller that raised privileges must not let its user's environment choose files.
 std::string configPath() {
@@ -60,6 +69,9 @@ void deliver(Channel channel, const Line& line, const std::string& component) no
 void CvLogger::logLevelMessage(const char* function, const char* file, int line,
                                const std::string& component, int level, const char*, int, int,
                                const std::string& message) {
+    if (listening.listener != nullptr) {
+        listening.listener(listening.context, component.c_str(), level, message.c_str());
+    }
     deliver(Channel::Log, {function, file, line, component, level, message}, component);
 }
 
@@ -70,3 +82,7 @@ void CvLogger::traceLevelMessage(const char* function, const char* file, int lin
 }
 
 } // namespace CvLog
+
+void qelo_setLogListener(QeloLogListener listener, void* context) {
+    CvLog::listening = {listener, context};
+}

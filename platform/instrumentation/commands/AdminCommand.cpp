@@ -11,19 +11,10 @@ namespace qelo::store {
 
 namespace {
 
-const std::string& loggerAdminCommand() {
-    static const std::string component = "Qelo.AdminCommand";
-    return component;
-}
-
 constexpr int kFailureLevel = 6000;
 
 CommandOutcome fail(const std::string& reason) {
-    const std::string message = "Command not carried out: " + reason;
-    CvLog::CvLogger::logLevelMessage("executeAdminCommand", "AdminCommand", __LINE__,
-                                     loggerAdminCommand(), kFailureLevel, nullptr, 0, 0, message);
-    CvLog::CvLogger::traceLevelMessage("executeAdminCommand", "AdminCommand", __LINE__,
-                                       loggerAdminCommand(), kFailureLevel, nullptr, 0, 0, message);
+    logRefusedCommand(reason);
     return {false, reason};
 }
 
@@ -40,6 +31,15 @@ CommandOutcome executeAdminCommand(const std::filesystem::path& root, const std:
         // Its text may be about a path or a value; that there was one is all that is said.
         return fail("an unexpected error");
     }
+}
+
+void logRefusedCommand(const std::string& reason) {
+    static const std::string component = kCommandComponent;
+    const std::string message = kRefusalPrefix + reason;
+    CvLog::CvLogger::logLevelMessage("executeAdminCommand", "AdminCommand", __LINE__, component,
+                                     kFailureLevel, nullptr, 0, 0, message);
+    CvLog::CvLogger::traceLevelMessage("executeAdminCommand", "AdminCommand", __LINE__, component,
+                                       kFailureLevel, nullptr, 0, 0, message);
 }
 
 } // namespace qelo::store

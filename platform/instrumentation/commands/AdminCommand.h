@@ -30,6 +30,11 @@
 
 namespace qelo::store {
 
+// How a command that was not carried out stands in the log, at level 6000: its component, and
+// what comes before the reason.
+constexpr char kCommandComponent[] = "Qelo.AdminCommand";
+constexpr char kRefusalPrefix[] = "Command not carried out: ";
+
 struct CommandOutcome {
     // Whether the command was carried out. When it was not, nothing has changed.
     bool accepted = false;
@@ -39,9 +44,13 @@ struct CommandOutcome {
 };
 
 // Carries out one command on <root>/etc. Commands on the same root wait for one another, in
-// all threads and processes. A failure is also written to the log (component
-// "Qelo.AdminCommand", level 6000). `command` is not kept; every copy of a password that is
-// made of it is wiped. Throws nothing but std::bad_alloc, and then has changed nothing.
+// all threads and processes. A failure is also written to the log. `command` is not kept; every
+// copy of a password that is made of it is wiped. Throws nothing but std::bad_alloc, and then has
+// changed nothing.
 CommandOutcome executeAdminCommand(const std::filesystem::path& root, const std::string& command);
+
+// Writes the reason of a refused command to the log and the trace, as executeAdminCommand
+// does; for stores that take no commands.
+void logRefusedCommand(const std::string& reason);
 
 } // namespace qelo::store

@@ -29,6 +29,8 @@ struct DamagedFile {
     std::vector<DamagedLine> (*lines)();
 };
 
+void PrintTo(const DamagedFile& file, std::ostream* stream) { *stream << file.name; }
+
 class DamagedLines : public testing::TestWithParam<DamagedFile> {
 protected:
     DamagedLines() {

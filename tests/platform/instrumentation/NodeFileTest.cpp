@@ -201,6 +201,9 @@ TEST_F(NodeFileStore, Cannot_be_written) {
     EXPECT_FALSE(cursor.write(AdminCommand, std::string("CreateUser")));
     EXPECT_FALSE(cursor.read(AdminCommand, status));
     EXPECT_EQ(status, "kept");
+#ifdef QELO_WITH_COMMANDS
+    EXPECT_THAT(loggedTexts().back(), HasSubstr("a node file takes no commands"));
+#endif
     EXPECT_FALSE(cursor.write(EntryCount, 5U));
 }
 

@@ -2,6 +2,7 @@
 // process of its own.
 #include "Scratch.h"
 
+#include "logging/LogListener.h"
 #include "platform/CvLogger.h"
 
 #include <gmock/gmock.h>
@@ -167,6 +168,54 @@ TEST_F(CvLoggerTest, A_log_on_a_full_disk_stops_nothing) {
         for (int line = 0; line < 100; ++line) {
             log(6000, "lost");
         }
+    });
+}
+
+struct Overheard {
+    std::vector<std::string> lines;
+
+    static void listen(void* context, const char* component, int level, const char* message) {
+        static_cast<Overheard*>(context)->lines.push_back(std::string(component) + " " +
+                                                          std::to_string(level) + " " + message);
+    }
+};
+
+TEST_F(CvLoggerTest, A_listener_is_told_of_lines_that_go_nowhere_else) {
+    configure("log.level = off\ntrace.level = 0\n");
+    inFreshProcess([] {
+        Overheard overheard;
+        log(6000, "before");
+        qelo_setLogListener(Overheard::listen, &overheard);
+        log(6000, "first");
+        trace(6000, "not of the log");
+        log(3000, "second", "Qelo.B");
+        qelo_setLogListener(nullptr, nullptr);
+        log(6000, "after");
+        EXPECT_THAT(overheard.lines,
+                    testing::ElementsAre("Corvane.A 6000 first", "Qelo.B 3000 second"));
+    });
+    EXPECT_FALSE(std::filesystem::exists(logPath));
+    EXPECT_THAT(linesOf(tracePath), SizeIs(1));
+}
+
+TEST_F(CvLoggerTest, A_listener_takes_nothing_from_the_log) {
+    inFreshProcess([] {
+        Overheard overheard;
+        qelo_setLogListener(Overheard::listen, &overheard);
+        log(6000, "kept");
+        qelo_setLogListener(nullptr, nullptr);
+    });
+    EXPECT_THAT(linesOf(logPath), SizeIs(1));
+}
+
+TEST_F(CvLoggerTest, A_listener_hears_its_own_thread_only) {
+    inFreshProcess([] {
+        Overheard overheard;
+        qelo_setLogListener(Overheard::listen, &overheard);
+        std::thread([] { log(6000, "elsewhere"); }).join();
+        log(6000, "here");
+        qelo_setLogListener(nullptr, nullptr);
+        EXPECT_THAT(overheard.lines, testing::ElementsAre("Corvane.A 6000 here"));
     });
 }
 

@@ -69,6 +69,29 @@ bool Broker::isA(const std::string& nameSpace, const std::string& sub,
     return hooks_.schema.isA && hooks_.schema.isA(nameSpace, sub, super);
 }
 
+const DeclaredClass* Broker::declaredClass(std::string_view nameSpace,
+                                           std::string_view className) const {
+    if (!hooks_.schema.findClass) {
+        return nullptr;
+    }
+    const cim::Class* known =
+        hooks_.schema.findClass(std::string(nameSpace), std::string(className));
+    if (!known) {
+        return nullptr;
+    }
+    {
+        const std::shared_lock lock(declaredMutex_);
+        const auto found = declared_.find(known);
+        if (found != declared_.end()) {
+            return found->second.get();
+        }
+    }
+    auto made = std::make_unique<const DeclaredClass>(*known);
+    const std::unique_lock lock(declaredMutex_);
+    // Another thread may have been faster: then its object stays.
+    return declared_.emplace(known, std::move(made)).first->second.get();
+}
+
 std::optional<std::vector<std::string>> Broker::keyNames(std::string_view nameSpace,
                                                          std::string_view className) const {
     if (!hooks_.schema.keyNames) {

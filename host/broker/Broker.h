@@ -2,6 +2,7 @@
 // behind it.
 #pragma once
 
+#include "DeclaredClass.h"
 #include "Hooks.h"
 #include "OperationContext.h"
 #include "Router.h"
@@ -13,6 +14,7 @@
 #include <memory>
 #include <mutex>
 #include <optional>
+#include <shared_mutex>
 #include <string>
 #include <string_view>
 #include <unordered_map>
@@ -49,6 +51,9 @@ public:
     void log(int severity, const std::string& id, const std::string& text) const;
 
     bool isA(const std::string& nameSpace, const std::string& sub, const std::string& super) const;
+    // What the schema declares of a class, or null. Valid as long as the broker.
+    const DeclaredClass* declaredClass(std::string_view nameSpace,
+                                       std::string_view className) const;
     std::optional<std::vector<std::string>> keyNames(std::string_view nameSpace,
                                                      std::string_view className) const;
 
@@ -78,6 +83,9 @@ private:
     // The handle of a catalog is the address of its entry.
     using Catalog = std::shared_ptr<const MessageCatalog>;
     std::map<CMPIMsgFileHandle, std::unique_ptr<Catalog>> catalogs_;
+
+    mutable std::shared_mutex declaredMutex_;
+    mutable std::unordered_map<const cim::Class*, std::unique_ptr<const DeclaredClass>> declared_;
 
     std::mutex blocksMutex_;
     std::unordered_map<void*, std::size_t> blocks_;

@@ -13,23 +13,6 @@ namespace {
 using Kind = ResultObject::Kind;
 using Target = ProviderRegistry::Target;
 
-cim::Instance withOnly(const cim::Instance& instance, const client::PropertyList& properties) {
-    if (!properties) {
-        return instance;
-    }
-    cim::Instance out(instance.path());
-    for (const cim::Instance::Property& property : instance.properties()) {
-        const bool wanted =
-            std::any_of(properties->begin(), properties->end(), [&](const std::string& name) {
-                return cim::sameName(name, property.name);
-            });
-        if (wanted) {
-            out.setProperty(property.name, property.value, property.origin);
-        }
-    }
-    return out;
-}
-
 // One association operation on one object.
 class Traversal {
 public:
@@ -211,8 +194,7 @@ std::vector<Dispatcher::Impl::Target>
 Dispatcher::Impl::associationTargets(const cim::ObjectPath& path,
                                      const std::string& assocClass) const {
     requireNameSpace(path);
-    const auto& hasClass = broker.hooks().schema.hasClass;
-    if (hasClass && !hasClass(path.nameSpace(), path.className())) {
+    if (broker.hooks().schema.hasClass && !registry.hasClass(path.nameSpace(), path.className())) {
         throw client::CimError(CMPI_RC_ERR_INVALID_PARAMETER,
                                "no such class: \"" + path.className() + "\"");
     }

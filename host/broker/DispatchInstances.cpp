@@ -28,6 +28,9 @@ void Dispatcher::enumerateInstanceNames(const OperationContext& context,
                 return slot ? slot(mi, call.context(), call.cmpiResult(), path) : noSuchSlot();
             });
         });
+        for (const cim::Instance* kept : impl_->staticInstances(classPath)) {
+            sink(kept->path());
+        }
     });
 }
 
@@ -56,12 +59,20 @@ void Dispatcher::enumerateInstances(const OperationContext& context,
                             : noSuchSlot();
             });
         });
+        for (const cim::Instance* kept : impl_->staticInstances(classPath)) {
+            sink(withOnly(*kept, properties));
+        }
     });
 }
 
 cim::Instance Dispatcher::getInstance(const OperationContext& context, const cim::ObjectPath& path,
                                       const client::PropertyList& properties) {
     return asOperation([&] {
+        for (const cim::Instance* kept : impl_->staticInstances(path)) {
+            if (kept->path() == path) {
+                return withOnly(*kept, properties);
+            }
+        }
         const auto target =
             impl_->requireServer(path, ProviderType::Instance, CMPI_RC_ERR_NOT_FOUND);
         CMPIInstanceMI* mi = target.provider->instanceMI(path.nameSpace());

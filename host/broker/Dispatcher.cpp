@@ -2,10 +2,30 @@
 
 #include "DispatcherImpl.h"
 
+#include <algorithm>
+
 namespace qelo::broker {
 
+cim::Instance withOnly(const cim::Instance& instance, const client::PropertyList& properties) {
+    if (!properties) {
+        return instance;
+    }
+    cim::Instance out(instance.path());
+    for (const cim::Instance::Property& property : instance.properties()) {
+        const bool wanted =
+            std::any_of(properties->begin(), properties->end(), [&](const std::string& name) {
+                return cim::sameName(name, property.name);
+            });
+        if (wanted) {
+            out.setProperty(property.name, property.value, property.origin);
+        }
+    }
+    return out;
+}
+
 void Dispatcher::Impl::requireNameSpace(const cim::ObjectPath& path) const {
-    if (!registry.hasNameSpace(path.nameSpace())) {
+    const auto& schemaHas = broker.hooks().schema.hasNameSpace;
+    if (!registry.hasNameSpace(path.nameSpace()) && !(schemaHas && schemaHas(path.nameSpace()))) {
         throw client::CimError(CMPI_RC_ERR_INVALID_NAMESPACE,
                                "no such namespace: \"" + path.nameSpace() + "\"");
     }
@@ -35,6 +55,22 @@ cim::ObjectPath Dispatcher::Impl::spelled(const cim::ObjectPath& path) const {
     cim::ObjectPath copy = path;
     copy.setClassName(registry.registeredSpelling(path.className()));
     return copy;
+}
+
+std::vector<const cim::Instance*>
+Dispatcher::Impl::staticInstances(const cim::ObjectPath& classPath) const {
+    const auto& instancesOf = broker.hooks().schema.instances;
+    if (!instancesOf) {
+        return {};
+    }
+    const std::string& nameSpace = classPath.nameSpace();
+    auto kept = instancesOf(nameSpace, classPath.className());
+    const auto isServed = [&](const cim::Instance* instance) {
+        return registry.serverOf(nameSpace, instance->className(), ProviderType::Instance)
+                   .provider != nullptr;
+    };
+    kept.erase(std::remove_if(kept.begin(), kept.end(), isServed), kept.end());
+    return kept;
 }
 
 void Dispatcher::Impl::askAll(const std::vector<Target>& targets,

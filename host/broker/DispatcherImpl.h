@@ -36,6 +36,10 @@ public:
     // `path` with its class spelled as registered, so that providers may compare exactly.
     cim::ObjectPath spelled(const cim::ObjectPath& path) const;
 
+    // The static instances of a class and its subclasses, those of classes that have no
+    // provider.
+    std::vector<const cim::Instance*> staticInstances(const cim::ObjectPath& classPath) const;
+
     // Asks each target in turn. One that does not support the operation, or finds nothing,
     // does not spoil the answers of the others; it is an error only for a single target that
     // does not support it.
@@ -45,6 +49,9 @@ public:
     Broker broker;
     ProviderRegistry registry;
 };
+
+// The instance with the named properties only, if there is a list.
+cim::Instance withOnly(const cim::Instance& instance, const client::PropertyList& properties);
 
 // Runs an operation; a refusal from inside the broker comes out as CimError.
 template <class Operation> auto asOperation(Operation operation) {

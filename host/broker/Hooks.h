@@ -3,6 +3,9 @@
 // any thread, several at once, and are set before the first request.
 #pragma once
 
+#include <cim/Class.h>
+#include <cim/Instance.h>
+
 #include <functional>
 #include <memory>
 #include <optional>
@@ -17,8 +20,22 @@ struct SchemaHooks {
                        const std::string& super)>
         isA;
 
-    // The names of the key properties of a class; nothing for a class that the schema does
-    // not know. Empty: no class is known.
+    // Whether the schema has that namespace. Empty: one exists when a provider serves it.
+    std::function<bool(const std::string& nameSpace)> hasNameSpace;
+
+    // The declaration of a class, valid and unchanged as long as the broker; null for a class
+    // that the schema does not know, whose instances may have any properties. Empty: no class
+    // is known.
+    std::function<const cim::Class*(const std::string& nameSpace, const std::string& className)>
+        findClass;
+
+    // The static instances of a class and its subclasses. Empty: there are none.
+    std::function<std::vector<const cim::Instance*>(const std::string& nameSpace,
+                                                    const std::string& className)>
+        instances;
+
+    // For classes that findClass does not know: the names of the key properties, or nothing.
+    // Empty: not known either.
     std::function<std::optional<std::vector<std::string>>(const std::string& nameSpace,
                                                           const std::string& className)>
         keyNames;

@@ -2,6 +2,7 @@
 
 #include "Broker.h"
 #include "Data.h"
+#include "Slot.h"
 
 namespace qelo::broker {
 namespace {
@@ -11,6 +12,11 @@ void learnKeys(InstanceObject& instance) {
         return;
     }
     const ObjectPathObject& path = *instance.path;
+    instance.declared =
+        instance.broker->declaredClass(path.nameSpace->view(), path.className->view());
+    if (instance.declared) {
+        return;
+    }
     const auto names = instance.broker->keyNames(path.nameSpace->view(), path.className->view());
     instance.keysKnown = names.has_value();
     if (!names) {
@@ -26,10 +32,36 @@ bool canBeKey(const CMPIData& data) {
            data.type != CMPI_instance;
 }
 
+// The declaration of a property; null when the class or the property is not known.
+const DeclaredProperty* declaredProperty(const InstanceObject& instance, std::string_view name,
+                                         std::uint32_t hash) {
+    return instance.declared ? instance.declared->find(name, hash) : nullptr;
+}
+
+// Refuses what contradicts the class. A null of no type gets the declared one.
+void checkDeclared(const InstanceObject& instance, const DeclaredProperty* declared,
+                   CMPIData& data) {
+    if (!instance.declared) {
+        return;
+    }
+    if (!declared) {
+        throw Refusal{CMPI_RC_ERR_NO_SUCH_PROPERTY};
+    }
+    if (data.type == CMPI_null) {
+        data.type = declared->type;
+    }
+    if (!declared->accepts(data.type)) {
+        throw Refusal{CMPI_RC_ERR_TYPE_MISMATCH};
+    }
+}
+
 bool isKey(InstanceObject& instance, std::string_view name, std::uint32_t hash,
-           const CMPIData& data) {
+           const CMPIData& data, const DeclaredProperty* declared) {
     if (!canBeKey(data)) {
         return false;
+    }
+    if (instance.declared) {
+        return declared && declared->key;
     }
     if (instance.keyNames.has(name, hash) || instance.path->keys.find(name, hash)) {
         return true;
@@ -38,8 +70,8 @@ bool isKey(InstanceObject& instance, std::string_view name, std::uint32_t hash,
 }
 
 void noteKey(InstanceObject& instance, std::string_view name, std::uint32_t hash,
-             const CMPIData& data) {
-    if (!isKey(instance, name, hash, data)) {
+             const CMPIData& data, const DeclaredProperty* declared) {
+    if (!isKey(instance, name, hash, data, declared)) {
         return;
     }
     // Text never changes once made and can be shared; a path could be changed from outside.
@@ -50,7 +82,8 @@ void noteKey(InstanceObject& instance, std::string_view name, std::uint32_t hash
 
 void noteKeys(InstanceObject& instance, const EntryList& properties) {
     for (const Entry& entry : properties) {
-        noteKey(instance, entry.name->view(), entry.hash, entry.data);
+        noteKey(instance, entry.name->view(), entry.hash, entry.data,
+                declaredProperty(instance, entry.name->view(), entry.hash));
     }
 }
 
@@ -89,10 +122,12 @@ InstanceObject* newInstance(Arena& arena, const ObjectPathObject& path, Ownershi
     return instance;
 }
 
-void setProperty(InstanceObject& instance, std::string_view name, const CMPIData& data,
+void setProperty(InstanceObject& instance, std::string_view name, CMPIData data,
                  StringObject* origin) {
     const std::uint32_t hash = nameHash(name);
-    noteKey(instance, name, hash, data);
+    const DeclaredProperty* declared = declaredProperty(instance, name, hash);
+    checkDeclared(instance, declared, data);
+    noteKey(instance, name, hash, data, declared);
     if (instance.filtered && !instance.filter.has(name, hash)) {
         return;
     }
@@ -105,7 +140,9 @@ void setPropertyFilter(InstanceObject& instance, const char** properties, const 
     instance.filtered = properties != nullptr;
     instance.filter.clear();
     addNames(arena, instance.filter, properties);
-    addNames(arena, instance.keyNames, keys);
+    if (!instance.declared) {
+        addNames(arena, instance.keyNames, keys);
+    }
     if (instance.properties.size() + instance.hidden.size() == 0) {
         return;
     }

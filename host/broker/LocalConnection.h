@@ -8,14 +8,19 @@
 
 #include "Dispatcher.h"
 
+#include <schema/ClassRepository.h>
+
 #include <memory>
 
 namespace qelo::broker {
 
 class LocalConnection final : public client::Connection {
 public:
-    // Every request is made with `context`. The default is nobody in particular.
-    explicit LocalConnection(std::shared_ptr<Router> router, OperationContext context = {});
+    // Every request is made with `context`. The default is nobody in particular. Without a
+    // repository, no class is known: keys keep the types that they come with, and the
+    // operations on classes answer 7 (not supported).
+    explicit LocalConnection(std::shared_ptr<Router> router, OperationContext context = {},
+                             std::shared_ptr<const schema::ClassRepository> repository = nullptr);
 
     void enumerateInstanceNames(const cim::ObjectPath& classPath,
                                 const client::PathSink& sink) override;
@@ -36,10 +41,19 @@ public:
                         const client::PathSink& sink) override;
     client::MethodResult invokeMethod(const cim::ObjectPath& path, const std::string& method,
                                       const client::Arguments& in) override;
+    cim::Class getClass(const cim::ObjectPath& classPath) override;
+    void enumerateClassNames(const cim::ObjectPath& classPath, bool deep,
+                             const client::NameSink& sink) override;
 
 private:
+    // The path with its keys in the types that its class declares.
+    cim::ObjectPath declared(const cim::ObjectPath& path) const;
+    // CimError when there is no repository, or not that namespace in it.
+    const schema::ClassRepository& classesOf(const std::string& nameSpace) const;
+
     std::shared_ptr<Router> router_;
     OperationContext context_;
+    std::shared_ptr<const schema::ClassRepository> repository_;
 };
 
 } // namespace qelo::broker

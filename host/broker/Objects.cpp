@@ -156,6 +156,7 @@ InstanceObject* copyOf(const InstanceObject& source, Arena& arena, Ownership own
     copyNames(copy->keyNames, source.keyNames, arena);
     copy->filtered = source.filtered;
     copy->keysKnown = source.keysKnown;
+    copy->declared = source.declared;
     copy->broker = source.broker;
     return copy;
 }

@@ -15,6 +15,7 @@
 namespace qelo::broker {
 
 class Broker;
+class DeclaredClass;
 
 enum class Ownership : std::uint8_t {
     Call,      // made by a factory or an up-call: ends with the call, or early when released
@@ -141,7 +142,8 @@ struct InstanceObject : Object<CMPIInstance, CMPIInstanceFT> {
     bool filtered = false;
     NameSet filter;
     NameSet keyNames;       // properties that are keys, from the schema or the provider
-    bool keysKnown = false; // the schema knows the class
+    bool keysKnown = false; // the schema names the keys of the class
+    const DeclaredClass* declared = nullptr; // null: the schema does not know the class
     const Broker* broker = nullptr;
     static const Table table;
     static constexpr const char* typeName = "CMPIInstance";

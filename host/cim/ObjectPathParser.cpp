@@ -166,6 +166,10 @@ private:
         if (!value) {
             const bool negative = !text.empty() && text[0] == '-';
             value = parseValue(negative ? Type::SInt64 : Type::UInt64, text, problem);
+            // -0 is printed as 0, which has to read as the same key.
+            if (negative && value && value->asSigned() == 0) {
+                value = Value::unsignedInteger(Type::UInt64, 0);
+            }
         }
         if (value) {
             position_ = start + text.size();

@@ -228,20 +228,27 @@ client::Arguments argumentsOf(const Request& request) {
     return arguments;
 }
 
+// The provider answers every refusal with the same words. Why stands in the store's log line,
+// which this process can overhear when the store is its own.
+[[noreturn]] void fail(const CommandContext& context, const client::CimError& error) {
+    const std::string reason = context.refusalReason();
+    throw client::CimError(
+        error.code(),
+        "refused or failed, nothing was changed" +
+            (reason.empty() ? std::string("; the log says why: ") + error.what() : ": " + reason));
+}
+
 void administer(CommandContext& context, const Request& request) {
+    constexpr unsigned int failed = 1;
     client::Connection& connection = context.connectionForChanges();
     const cim::ObjectPath target(context.options().nameSpace, request.form.className);
     try {
         connection.invokeMethod(target, request.form.method, argumentsOf(request));
     } catch (const client::CimError& error) {
-        constexpr unsigned int failed = 1;
         if (error.code() != failed) {
             throw;
         }
-        // The provider's own text does not tell why; the store's log line does.
-        throw client::CimError(failed, std::string("refused or failed, nothing was changed; "
-                                                   "the log says why: ") +
-                                           error.what());
+        fail(context, error);
     }
     std::string names;
     for (const std::string& position : request.positions) {

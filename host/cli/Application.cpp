@@ -5,6 +5,8 @@
 #include "ExitStatus.h"
 #include "render/Display.h"
 
+#include <client/Unreachable.h>
+
 #include <algorithm>
 #include <exception>
 #include <new>
@@ -18,8 +20,10 @@ constexpr char kFooter[] =
     "A path is written as ein prints it: ZANTH_Group.CreationClassName=\"ZANTH_Group\","
     "Name=\"adm\".\n\n"
     "Exit status: 0 done; 1 to 63 the CIM status code of the error (1 failed, 5 no such class,\n"
-    "6 not found, 7 not supported, ...); 64 the command line is wrong; 66 the store cannot be\n"
-    "read; 70 internal error; 74 the output cannot be written; 141 its reader has gone.";
+    "6 not found, 7 not supported, ...); 64 the command line is wrong; 66 the store or the\n"
+    "schema cannot be read; 69 the server cannot be reached; 70 internal error; 74 the output "
+    "cannot be written; "
+    "141 its reader has gone.";
 
 // Exactly one line, whatever stands in the message.
 void report(Output& errors, const std::string& message) {
@@ -53,6 +57,7 @@ void addCommands(CLI::App& app, Invocation& invocation, const Environment& envir
     addGroupCommands(app, invocation);
     addIdentityCommands(app, invocation);
     addInstanceCommands(app, invocation);
+    addSchemaCommands(app, invocation);
     addAssociationCommands(app, invocation);
     addMethodCommands(app, invocation);
     addServiceCommands(app, invocation);
@@ -114,8 +119,9 @@ void run(int count, const char* const* arguments, const Environment& environment
         environment.output.flush();
         return;
     }
+    checkCommonOptions(invocation.options);
     CommandContext context(invocation.options, environment.connect, environment.output,
-                           environment.groupIds);
+                           environment.groupIds, environment.refusalReason);
     invocation.action(context);
     environment.output.flush(); // before the providers are shut down
 }
@@ -161,6 +167,8 @@ int runApplication(int count, const char* const* arguments, const Environment& e
         return fail(error.what() + hint(error, invocation), ExitUsage);
     } catch (const StoreError& error) {
         return fail(error.what(), ExitNoInput);
+    } catch (const client::Unreachable& error) {
+        return fail(error.what(), ExitUnavailable);
     } catch (const client::CimError& error) {
         return failCommand(describe(error), exitStatusOf(error.code()));
     } catch (const std::bad_alloc&) {

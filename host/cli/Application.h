@@ -24,6 +24,8 @@ struct Environment {
     std::vector<std::function<void(CLI::App&, Invocation&)>> furtherCommands = {};
     // The ids of groups, by name, where the process can tell; may be empty.
     GroupIds groupIds = {};
+    // Why a method call was refused, where the process can tell; may be empty.
+    RefusalReason refusalReason = {};
 };
 
 // Never throws. The result is the exit status of ExitStatus.h; both outputs are flushed.

@@ -4,6 +4,7 @@
 #include "render/Writer.h"
 
 #include <memory>
+#include <utility>
 
 namespace qelo::cli {
 namespace {
@@ -55,6 +56,17 @@ std::string nameProblem(const std::string& text) {
     return isName(text) ? "" : "not a name: \"" + text + "\"";
 }
 
+// For the associations themselves, users of wbemcli give their class either way.
+void takeAssociationClassAsResult(client::AssociationFilter& filter) {
+    if (filter.assocClass.empty()) {
+        return;
+    }
+    if (!filter.resultClass.empty() && !cim::sameName(filter.resultClass, filter.assocClass)) {
+        throw UsageError("-ac and -rc both name the class of the associations, and differ");
+    }
+    filter.resultClass = std::exchange(filter.assocClass, {});
+}
+
 void addFilter(CLI::App& command, const char* option, std::string& value, const char* type,
                const char* description) {
     command.add_option(option, value, description)->check(nameProblem)->type_name(type);
@@ -73,8 +85,11 @@ struct Form {
 void addOperation(CLI::App& app, Invocation& invocation, const Form& form) {
     const auto source = std::make_shared<Source>();
     CLI::App* command = addCommand(app, invocation, form.name, form.description,
-                                   [source, operation = form.operation](CommandContext& context) {
-                                       operation(context, *source);
+                                   [source, form](CommandContext& context) {
+                                       if (!form.farEnd) {
+                                           takeAssociationClassAsResult(source->filter);
+                                       }
+                                       form.operation(context, *source);
                                    });
     command->add_option("PATH", source->path, "The instance to start from")
         ->required()
@@ -84,7 +99,16 @@ void addOperation(CLI::App& app, Invocation& invocation, const Form& form) {
               "(-rc) Only results of this class");
     addFilter(*command, "-r,--role", filter.role, "ROLE",
               "Only where the source has this role in the association");
-    if (form.farEnd) {
+    if (!form.farEnd) {
+        addFilter(*command, "--assoc-class", filter.assocClass, "CLASS", "(-ac) The same");
+        command
+            ->add_option_function<std::string>("--result-role",
+                                               [](const std::string&) {
+                                                   throw CLI::ValidationError(
+                                                       "rin and ri have no result role");
+                                               })
+            ->group("");
+    } else {
         addFilter(*command, "--assoc-class", filter.assocClass, "CLASS",
                   "(-ac) Only through associations of this class");
         addFilter(*command, "--result-role", filter.resultRole, "ROLE",

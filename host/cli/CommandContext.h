@@ -28,7 +28,7 @@ private:
     std::string command_;
 };
 
-// The store that the accounts are read from cannot be read.
+// What an answer is made from cannot be read: the store of the accounts, or the schema.
 class StoreError : public std::runtime_error {
 public:
     using std::runtime_error::runtime_error;
@@ -37,14 +37,17 @@ public:
 // The ids of groups by their names; the class of groups has no property for them.
 using GroupIds = std::function<std::map<std::string, std::string>()>;
 
+// Why the last command was refused, in words for people; empty where that is not known.
+using RefusalReason = std::function<std::string()>;
+
 using ConnectionFactory = std::function<std::unique_ptr<client::Connection>(const Options&)>;
 
 class CommandContext {
 public:
     CommandContext(Options options, ConnectionFactory connect, Output& output,
-                   GroupIds groupIds = {})
+                   GroupIds groupIds = {}, RefusalReason refusalReason = {})
         : options_(std::move(options)), connect_(std::move(connect)), output_(output),
-          groupIds_(std::move(groupIds)) {}
+          groupIds_(std::move(groupIds)), refusalReason_(std::move(refusalReason)) {}
 
     const Options& options() const { return options_; }
     Output& output() { return output_; }
@@ -63,16 +66,21 @@ public:
         return connection();
     }
 
-    // Empty where the ids are not known here.
+    // Empty where the ids are not known here; those of a server's groups never are.
     std::map<std::string, std::string> groupIds() {
-        return groupIds_ ? groupIds_() : std::map<std::string, std::string>();
+        return groupIds_ && options_.url.empty() ? groupIds_()
+                                                 : std::map<std::string, std::string>();
     }
+
+    // Of the last method call that failed; empty where it is not known here.
+    std::string refusalReason() const { return refusalReason_ ? refusalReason_() : std::string(); }
 
 private:
     Options options_;
     ConnectionFactory connect_;
     Output& output_;
     GroupIds groupIds_;
+    RefusalReason refusalReason_;
     std::unique_ptr<client::Connection> connection_;
 };
 

@@ -39,7 +39,44 @@ Format formatOf(const std::string& text) {
     return text == "mof" ? Format::Mof : Format::Text;
 }
 
+std::string fileProblem(const std::string& text) {
+    return text.empty() ? "the name of a file is expected" : "";
+}
+
+// The object manager may be a server; then nothing of this machine matters.
+std::vector<CLI::Option*> addServerOptions(CLI::App& app, Options& options) {
+    auto* url = app.add_option("--url", options.url,
+                               "Ask the server at http[s]://[USER[:PASSWORD]@]HOST[:PORT]");
+    url->check([](const std::string& text) {
+        return text.empty() ? std::string("the address of a server is expected") : std::string();
+    });
+    auto* password = app.add_option("--password-file", options.passwordFile,
+                                    "The password for --url is the first line of FILE");
+    auto* trusted = app.add_option("--ca-cert", options.caCertificate,
+                                   "Trust the certificates in FILE, not those of the system");
+    for (auto* option : {password, trusted}) {
+        option->check(fileProblem)->type_name("FILE");
+    }
+    auto* insecure = app.add_flag("--insecure", options.insecure, "Trust any certificate");
+    insecure->excludes(trusted);
+    return {url->type_name("URL"), password, trusted, insecure};
+}
+
 } // namespace
+
+void checkCommonOptions(const Options& options) {
+    const bool local = !options.store.empty() || !options.providerDirectories.empty();
+    if (!options.url.empty() && local) {
+        throw UsageError("--url asks a server; --store, --root and --provider-dir are for "
+                         "providers in this process");
+    }
+    const bool remote =
+        !options.passwordFile.empty() || !options.caCertificate.empty() || options.insecure;
+    if (options.url.empty() && remote) {
+        throw UsageError("--password-file, --ca-cert and --insecure are for a server; --url names "
+                         "one");
+    }
+}
 
 HelpFormat::HelpFormat() { column_width(24); }
 
@@ -70,7 +107,15 @@ void addCommonOptions(CLI::App& app, Options& options) {
     auto* directories = app.add_option("--provider-dir", options.providerDirectories,
                                        "Look for provider libraries in DIR only; may be repeated");
     directories->check(directoryProblem)->expected(1)->take_all()->type_name("DIR");
-    for (auto* option : {format, json, store, root, nameSpace, directories}) {
+    auto* schema =
+        app.add_option("--schema-dir", options.schemaDirectories,
+                       "Read classes (*.mof) and registrations (*.reg) from DIR only; may be "
+                       "repeated");
+    schema->check(directoryProblem)->expected(1)->take_all()->type_name("DIR");
+    for (auto* option : {format, json, store, root, nameSpace, directories, schema}) {
+        option->group(kCommonGroup);
+    }
+    for (auto* option : addServerOptions(app, options)) {
         option->group(kCommonGroup);
     }
 }

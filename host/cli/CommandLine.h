@@ -29,6 +29,10 @@ public:
 // Options that every command takes.
 void addCommonOptions(CLI::App& app, Options& options);
 
+// UsageError when they contradict each other. They may stand on both sides of the command, so
+// that only the whole tells.
+void checkCommonOptions(const Options& options);
+
 // A command that has the common options and runs `action` when it is chosen. Further
 // arguments are added to the result. `invocation` must outlive `app`.
 CLI::App* addCommand(CLI::App& app, Invocation& invocation, const std::string& name,
@@ -39,6 +43,7 @@ void addAccountCommands(CLI::App& app, Invocation& invocation);
 void addGroupCommands(CLI::App& app, Invocation& invocation);
 void addIdentityCommands(CLI::App& app, Invocation& invocation);
 void addInstanceCommands(CLI::App& app, Invocation& invocation);
+void addSchemaCommands(CLI::App& app, Invocation& invocation);
 void addAssociationCommands(CLI::App& app, Invocation& invocation);
 void addMethodCommands(CLI::App& app, Invocation& invocation);
 void addServiceCommands(CLI::App& app, Invocation& invocation);

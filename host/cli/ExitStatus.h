@@ -9,7 +9,8 @@ namespace qelo::cli {
 enum ExitStatus : int {
     ExitSuccess = 0,
     ExitUsage = 64,       // the command line cannot be understood
-    ExitNoInput = 66,     // the store of --store cannot be read
+    ExitNoInput = 66,     // the store of --store or the schema cannot be read
+    ExitUnavailable = 69, // the server of --url cannot be reached
     ExitSoftware = 70,    // something that should not happen
     ExitOutput = 74,      // the output cannot be written
     ExitClosedPipe = 141, // the reader of the output has gone; as if SIGPIPE had ended us

@@ -1,6 +1,7 @@
-// The classes that the commands know by name, and which provider serves each of them.
+// The classes that the commands know by name.
 #pragma once
 
+#include <string>
 #include <string_view>
 #include <vector>
 
@@ -13,16 +14,8 @@ constexpr char kServiceClass[] = "ZANTH_AccountManagementService";
 constexpr char kCapabilitiesClass[] = "ZANTH_AccountManagementCapabilities";
 constexpr char kComputerSystemClass[] = "ZANTH_ComputerSystem";
 
-struct KnownClass {
-    const char* className;
-    const char* provider; // the name in front of _Create_<Type>MI
-    const char* library;  // "X" for libX.so.1
-    bool association;
-    bool methods;
-};
-
-// Every class serves instances; `association` and `methods` tell what it serves beside.
-const std::vector<KnownClass>& knownClasses();
+// The association classes.
+const std::vector<std::string>& knownAssociations();
 
 // Whether the class is an association among the known ones (names ignoring case).
 bool isKnownAssociation(std::string_view className);

@@ -14,6 +14,22 @@ struct Call {
     std::vector<std::string> arguments;
 };
 
+// The provider's words, and behind them the store's where this process can overhear it.
+client::MethodResult invoke(CommandContext& context, const cim::ObjectPath& path,
+                            const std::string& method, const client::Arguments& arguments) {
+    constexpr unsigned int failed = 1;
+    client::Connection& connection = context.connectionForChanges();
+    try {
+        return connection.invokeMethod(path, method, arguments);
+    } catch (const client::CimError& error) {
+        const std::string reason = error.code() == failed ? context.refusalReason() : "";
+        if (reason.empty()) {
+            throw;
+        }
+        throw client::CimError(failed, std::string(error.what()) + ": " + reason);
+    }
+}
+
 void callMethod(CommandContext& context, const Call& call) {
     if (context.options().format == Format::Mof) {
         throw UsageError("the result of a method has no MOF form; use text or json");
@@ -23,8 +39,7 @@ void callMethod(CommandContext& context, const Call& call) {
     }
     const cim::ObjectPath path = anyPathOf(call.path, context.options());
     const client::Arguments arguments = methodArgumentsOf(call.arguments);
-    const client::MethodResult result =
-        context.connectionForChanges().invokeMethod(path, call.method, arguments);
+    const client::MethodResult result = invoke(context, path, call.method, arguments);
     writeMethodResult(context.options().format, result, context.output());
 }
 

@@ -1,10 +1,13 @@
 #include "PasswordInput.h"
 
 #include "CommandContext.h"
+#include "render/Display.h"
 
 #include <array>
+#include <cerrno>
 #include <cstring>
 #include <fcntl.h>
+#include <system_error>
 #include <termios.h>
 #include <unistd.h>
 
@@ -16,10 +19,12 @@ constexpr std::size_t kLongestPassword = 1024;
 // An open terminal whose echo is off as long as this lives.
 class SilentTerminal {
 public:
-    SilentTerminal() : descriptor_(open("/dev/tty", O_RDWR | O_CLOEXEC | O_NOCTTY)) {
+    // `instead`: the option for those who have no terminal.
+    explicit SilentTerminal(const std::string& instead)
+        : descriptor_(open("/dev/tty", O_RDWR | O_CLOEXEC | O_NOCTTY)) {
         if (descriptor_ < 0 || tcgetattr(descriptor_, &before_) != 0) {
             close();
-            throw UsageError("there is no terminal to ask for the password; use --password-stdin");
+            throw UsageError("there is no terminal to ask for the password; use " + instead);
         }
         termios silent = before_;
         silent.c_lflag &= ~static_cast<tcflag_t>(ECHO);
@@ -49,6 +54,17 @@ private:
     termios before_ = {};
 };
 
+class Descriptor {
+public:
+    explicit Descriptor(int number) : number_(number) {}
+    ~Descriptor() { ::close(number_); }
+    Descriptor(const Descriptor&) = delete;
+    Descriptor& operator=(const Descriptor&) = delete;
+
+private:
+    int number_;
+};
+
 // One line. Read a byte at a time, so that nothing behind the line is taken.
 Password readLine(int descriptor) {
     std::array<char, kLongestPassword> line = {};
@@ -75,8 +91,25 @@ Password::~Password() { explicit_bzero(text_.data(), text_.size()); }
 
 Password passwordFromInput() { return readLine(STDIN_FILENO); }
 
+Password passwordFromFile(const std::string& file) {
+    const int descriptor = open(file.c_str(), O_RDONLY | O_CLOEXEC | O_NOCTTY);
+    if (descriptor < 0) {
+        throw UsageError("cannot read " + file + ": " + std::generic_category().message(errno));
+    }
+    const Descriptor owner(descriptor);
+    return readLine(descriptor);
+}
+
+Password passwordForServer(const std::string& user, const std::string& server) {
+    const SilentTerminal terminal("--password-file");
+    terminal.say("Password of " + displayText(user) + " at " + displayText(server) + ": ");
+    Password password = readLine(terminal.descriptor());
+    terminal.say("\n");
+    return password;
+}
+
 Password passwordFromTerminal(const std::string& account) {
-    const SilentTerminal terminal;
+    const SilentTerminal terminal("--password-stdin");
     terminal.say("New password for " + account + ": ");
     Password first = readLine(terminal.descriptor());
     terminal.say("\nOnce more: ");

@@ -25,6 +25,12 @@ private:
 // none, or one that no password can be (over 1 KiB, or with a NUL in it).
 Password passwordFromInput();
 
+// The first line of a file; UsageError as above, or when it cannot be read.
+Password passwordFromFile(const std::string& file);
+
+// Asked for once on the terminal, without echo. UsageError when there is no terminal.
+Password passwordForServer(const std::string& user, const std::string& server);
+
 // Asked for twice on the terminal, without echo. Throws UsageError when there is no terminal
 // or the two differ.
 Password passwordFromTerminal(const std::string& account);

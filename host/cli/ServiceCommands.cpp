@@ -93,17 +93,14 @@ private:
 
     std::vector<Branch> branchesOf(const cim::ObjectPath& path) {
         std::vector<Branch> branches;
-        for (const KnownClass& known : knownClasses()) {
-            if (known.association) {
-                client::AssociationFilter filter;
-                filter.assocClass = known.className;
-                context_.connection().associatorNames(
-                    path, filter, [&](const cim::ObjectPath& found) {
-                        if (met_.insert(found.toText(false, false)).second) {
-                            branches.push_back({known.className, found});
-                        }
-                    });
-            }
+        for (const std::string& association : knownAssociations()) {
+            client::AssociationFilter filter;
+            filter.assocClass = association;
+            context_.connection().associatorNames(path, filter, [&](const cim::ObjectPath& found) {
+                if (met_.insert(found.toText(false, false)).second) {
+                    branches.push_back({association, found});
+                }
+            });
         }
         return branches;
     }

@@ -2,7 +2,10 @@
 #include "Application.h"
 #include "local/GroupIds.h"
 #include "local/LocalProviders.h"
+#include "local/Refusals.h"
 #include "local/RootCommand.h"
+#include "local/ServeCommand.h"
+#include "remote/ServerConnection.h"
 
 #include <clocale>
 #include <csignal>
@@ -34,6 +37,11 @@ void chooseLanguage() {
     }
 }
 
+std::unique_ptr<qelo::client::Connection> connect(const qelo::cli::Options& options) {
+    return options.url.empty() ? qelo::cli::connectToLocalProviders(options)
+                               : qelo::cli::connectToServer(options);
+}
+
 } // namespace
 
 int main(int argc, char** argv) {
@@ -44,9 +52,10 @@ int main(int argc, char** argv) {
     qelo::cli::FileOutput output(STDOUT_FILENO);
     qelo::cli::FileOutput errors(STDERR_FILENO);
     return qelo::cli::runApplication(argc, argv,
-                                     {qelo::cli::connectToLocalProviders,
+                                     {connect,
                                       output,
                                       errors,
-                                      {qelo::cli::addRootCommand},
-                                      qelo::cli::localGroupIds});
+                                      {qelo::cli::addRootCommand, qelo::cli::addServeCommand},
+                                      qelo::cli::localGroupIds,
+                                      qelo::cli::overhearRefusals()});
 }

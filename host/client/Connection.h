@@ -3,6 +3,7 @@
 // loads providers into this process, another talks to a server; commands cannot tell which.
 #pragma once
 
+#include <cim/Class.h>
 #include <cim/Instance.h>
 
 #include <functional>
@@ -39,6 +40,8 @@ struct AssociationFilter {
     std::string resultRole;
 };
 
+using NameSink = std::function<void(const std::string&)>;
+
 using Arguments = std::vector<std::pair<std::string, cim::Value>>;
 
 struct MethodResult {
@@ -70,6 +73,14 @@ public:
 
     virtual MethodResult invokeMethod(const cim::ObjectPath& path, const std::string& method,
                                       const Arguments& in) = 0;
+
+    // The class with everything it inherits, qualifiers included. CimError 6 when there is
+    // no such class.
+    virtual cim::Class getClass(const cim::ObjectPath& classPath) = 0;
+    // The names of the subclasses of a class, or, when the path names none, of the classes
+    // without superclass; `deep`: of all below them too.
+    virtual void enumerateClassNames(const cim::ObjectPath& classPath, bool deep,
+                                     const NameSink& sink) = 0;
 };
 
 } // namespace qelo::client

@@ -43,8 +43,24 @@ private:
     std::array<int, 2> ends_{-1, -1};
 };
 
+// A pipe that holds `text` and has no writer any more.
+void fill(Pipe& pipe, const std::string& text) {
+    // Nobody reads yet, so more than fits would wait for ever.
+    fcntl(pipe.writer(), F_SETFL, O_NONBLOCK);
+    if (write(pipe.writer(), text.data(), text.size()) != static_cast<ssize_t>(text.size())) {
+        throw std::runtime_error("the input does not fit into a pipe");
+    }
+    pipe.closeWriter();
+}
+
+struct Streams {
+    int in;
+    int out; // -1: closed
+    int err;
+};
+
 [[noreturn]] void becomeProgram(const std::vector<std::string>& command, const Variables& variables,
-                                int out, int err) {
+                                const Streams& streams) {
     for (const auto& [name, value] : variables) {
         setenv(name.c_str(), value.c_str(), 1);
     }
@@ -54,10 +70,10 @@ private:
     }
     arguments.push_back(nullptr);
     std::signal(SIGPIPE, SIG_DFL);
-    dup2(open("/dev/null", O_RDONLY), STDIN_FILENO);
-    dup2(err, STDERR_FILENO);
-    if (out >= 0) {
-        dup2(out, STDOUT_FILENO);
+    dup2(streams.in, STDIN_FILENO);
+    dup2(streams.err, STDERR_FILENO);
+    if (streams.out >= 0) {
+        dup2(streams.out, STDOUT_FILENO);
     } else {
         close(STDOUT_FILENO);
     }
@@ -100,8 +116,11 @@ int waitFor(pid_t child) {
     return WIFEXITED(status) ? WEXITSTATUS(status) : 128 + WTERMSIG(status);
 }
 
-Finished run(const std::vector<std::string>& command, const Variables& variables, bool capture,
-             int output) {
+// Standard output is captured where `output` is null.
+Finished run(const std::vector<std::string>& command, const Variables& variables,
+             const std::string& input, const int* output) {
+    Pipe in;
+    fill(in, input);
     Pipe out;
     Pipe err;
     const pid_t child = fork();
@@ -109,7 +128,8 @@ Finished run(const std::vector<std::string>& command, const Variables& variables
         throw std::runtime_error("no process");
     }
     if (child == 0) {
-        becomeProgram(command, variables, capture ? out.writer() : output, err.writer());
+        becomeProgram(command, variables,
+                      {in.reader(), output == nullptr ? out.writer() : *output, err.writer()});
     }
     out.closeWriter();
     err.closeWriter();
@@ -126,12 +146,17 @@ Finished run(const std::vector<std::string>& command, const Variables& variables
 } // namespace
 
 Finished runProcess(const std::vector<std::string>& command, const Variables& variables) {
-    return run(command, variables, true, -1);
+    return run(command, variables, {}, nullptr);
+}
+
+Finished runProcessWithInput(const std::string& input, const std::vector<std::string>& command,
+                             const Variables& variables) {
+    return run(command, variables, input, nullptr);
 }
 
 Finished runProcessInto(int output, const std::vector<std::string>& command,
                         const Variables& variables) {
-    return run(command, variables, false, output);
+    return run(command, variables, {}, &output);
 }
 
 } // namespace qelo::endtoend

@@ -19,7 +19,11 @@ using Variables = std::vector<std::pair<std::string, std::string>>;
 // added. Standard input is empty. A program that runs for more than two minutes is ended.
 Finished runProcess(const std::vector<std::string>& command, const Variables& variables = {});
 
-// The same with standard output on an open descriptor, or closed where that is -1.
+// The same with `input`, at most a pipe's 64 KiB, on standard input, which is empty otherwise.
+Finished runProcessWithInput(const std::string& input, const std::vector<std::string>& command,
+                             const Variables& variables = {});
+
+// As runProcess, with standard output on an open descriptor, or closed where that is -1.
 Finished runProcessInto(int output, const std::vector<std::string>& command,
                         const Variables& variables = {});
 

@@ -31,10 +31,35 @@ TEST(StoreProblem, A_node_file_that_does_not_exist_is_reported) {
 
 TEST(StoreProblem, A_node_file_that_is_not_JSON_is_reported) {
     const Scratch scratch;
-    for (const char* content : {"", "{", "{\"nodes\": [}", "nodes", "{}{}"}) {
-        EXPECT_EQ(problemWith("file:" + scratch.write("x.json", content)),
-                  scratch.path("x.json") + " is not valid JSON\n");
+    for (const char* content : {"", "{", "{\"nodes\": [}", "nodes", "{\"nodes\": []}{}"}) {
+        const std::string problem = problemWith("file:" + scratch.write("x.json", content));
+        EXPECT_EQ(problem.find("node file " + scratch.path("x.json") + " refused: "), 0U);
+        EXPECT_NE(problem.find(": not JSON in UTF-8 at byte "), std::string::npos) << problem;
     }
+}
+
+TEST(StoreProblem, A_node_file_of_another_shape_is_reported_with_the_place) {
+    const Scratch scratch;
+    const std::pair<const char*, const char*> cases[] = {
+        {"{}", "document: \"nodes\" is missing"},
+        {"[]", "document: an object is needed, not a list"},
+        {R"({"accounts": []})", "document: unknown member \"accounts\""},
+        {R"({"nodes": {}})", "document: \"nodes\" has to be a list, not an object"},
+        {R"({"nodes": [{"path": "/a"}]})", "node 0 \"/a\": \"type\" is missing"},
+        {R"({"nodes": [{"type": 46, "path": "/a", "properties": {"Name": "x"}}]})",
+         "node 0 \"/a\": a property is named by a decimal number, not \"Name\""},
+    };
+    for (const auto& [content, reason] : cases) {
+        EXPECT_EQ(problemWith("file:" + scratch.write("x.json", content)),
+                  "node file " + scratch.path("x.json") + " refused: " + reason + "\n");
+    }
+}
+
+TEST(StoreProblem, A_store_of_an_unknown_kind_in_the_environment_is_reported) {
+    const Finished finished = runProcess(qelosimCommand({}), {{"QELO_NODE_STORE", "accounts"}});
+    EXPECT_EQ(finished.status, kNoInput);
+    EXPECT_EQ(finished.err, "qelosim: QELO_NODE_STORE: \"accounts\" is neither accounts:DIR nor "
+                            "file:PATH\n");
 }
 
 TEST(StoreProblem, A_directory_is_no_node_file) {

@@ -5,6 +5,7 @@
 #include <fstream>
 #include <regex>
 #include <sstream>
+#include <sys/stat.h>
 #include <thread>
 #include <unistd.h>
 
@@ -42,11 +43,11 @@ protected:
     }
 
     // Runs a command that reads `password` from its standard input.
-    Finished runWithPassword(const std::string& arguments, const std::string& password) const {
-        return runProcess({"/bin/sh", "-c",
-                           "printf '%s\\n' \"$PASSWORD\" | '" QELOSIM "' " + arguments +
-                               " --password-stdin --root '" + root + "'"},
-                          {{"PASSWORD", password}, {"LC_ALL", "C.UTF-8"}});
+    Finished runWithPassword(std::vector<std::string> arguments,
+                             const std::string& password) const {
+        arguments.insert(arguments.end(), {"--password-stdin", "--root", root});
+        return runProcessWithInput(password + "\n", qelosimCommand(std::move(arguments)),
+                                   {{"LC_ALL", "C.UTF-8"}});
     }
 
     void expectDone(const Finished& finished, const std::string& words) const {
@@ -73,6 +74,17 @@ protected:
         return value;
     }
 
+    // Whether a field of any line of a file has this value.
+    bool hasField(const std::string& file, std::size_t index, const std::string& value) const {
+        std::istringstream lines(contentOf(root + "/etc/" + file));
+        for (std::string line; std::getline(lines, line);) {
+            if (field(file, line.substr(0, line.find(':')), index) == value) {
+                return true;
+            }
+        }
+        return false;
+    }
+
     // The account as the provider serves it now.
     nlohmann::json account(const std::string& name) const {
         const auto found =
@@ -86,12 +98,12 @@ protected:
 };
 
 TEST_F(UserLife, A_user_is_created_changed_locked_and_deleted) {
-    expectDone(runWithPassword("create-user alice --full-name 'Alice Example' --uid 4711 "
-                               "--home /home/alice --shell /bin/sh --create-home",
+    expectDone(runWithPassword({"create-user", "alice", "--full-name", "Alice Example", "--uid",
+                                "4711", "--home", "/home/alice", "--shell", "/bin/sh"},
                                "open sesame"),
                "created account alice");
     EXPECT_EQ(field("passwd", "alice", 2), "4711");
-    EXPECT_TRUE(std::filesystem::is_directory(root + "/home/alice"));
+    EXPECT_EQ(field("passwd", "alice", 5), "/home/alice");
     const std::string hash = field("shadow", "alice", 1);
     EXPECT_EQ(crypt("open sesame", hash.c_str()), hash);
     auto alice = account("alice");
@@ -120,17 +132,52 @@ TEST_F(UserLife, A_user_is_created_changed_locked_and_deleted) {
     EXPECT_EQ(alice["passwordExpirationDate"], "20300102000000.000000+000");
     EXPECT_EQ(field("shadow", "alice", 1), hash) << "what is not given stays as it is";
 
-    expectDone(runWithPassword("set-password alice", "xyzzy plugh"),
+    expectDone(runWithPassword({"set-password", "alice"}, "xyzzy plugh"),
                "set the password of account alice");
     const std::string second = field("shadow", "alice", 1);
     EXPECT_EQ(crypt("xyzzy plugh", second.c_str()), second);
 
-    expectDone(run({"delete-user", "alice", "--remove-home"}), "deleted account alice");
+    expectDone(run({"delete-user", "alice"}), "deleted account alice");
     EXPECT_EQ(entry("passwd", "alice"), "");
     EXPECT_EQ(entry("shadow", "alice"), "");
     EXPECT_EQ(entry("group", "alice"), "");
-    EXPECT_FALSE(std::filesystem::exists(root + "/home/alice"));
     EXPECT_EQ(run({"gi", "ZANTH_Account.Name=\"alice\""}).status, 6);
+}
+
+TEST_F(UserLife, A_home_is_made_with_its_account_and_removed_with_it) {
+    // An ordinary user can give a directory to nobody but himself.
+    const bool superuser = geteuid() == 0;
+    const std::string uid = superuser ? "4711" : std::to_string(geteuid());
+    const std::string gid = superuser ? "4712" : std::to_string(getegid());
+    if (hasField("passwd", 2, uid)) {
+        GTEST_SKIP() << "the scratch root has an account of this user's own id " << uid
+                     << ", and only the superuser may make homes for others";
+    }
+    if (!hasField("group", 2, gid)) {
+        expectDone(run({"create-group", "crew", "--gid", gid}), "created group crew");
+    }
+    expectDone(run({"create-user", "alice", "--uid", uid, "--gid", gid, "--home", "/home/alice",
+                    "--create-home"}),
+               "created account alice");
+    struct stat home {};
+    ASSERT_EQ(stat((root + "/home/alice").c_str(), &home), 0);
+    EXPECT_TRUE(S_ISDIR(home.st_mode));
+    EXPECT_EQ(std::to_string(home.st_uid), uid);
+    EXPECT_EQ(std::to_string(home.st_gid), gid);
+    expectDone(run({"delete-user", "alice", "--remove-home"}), "deleted account alice");
+    EXPECT_EQ(entry("passwd", "alice"), "");
+    EXPECT_FALSE(std::filesystem::exists(root + "/home/alice"));
+}
+
+TEST_F(UserLife, Only_the_superuser_makes_homes_for_others) {
+    if (geteuid() == 0) {
+        GTEST_SKIP() << "the superuser may make homes for others";
+    }
+    const std::string other = std::to_string(geteuid() + 1);
+    const Finished refused = run({"create-user", "alice", "--uid", other, "--create-home"});
+    EXPECT_EQ(refused.status, 1) << refused.out;
+    EXPECT_EQ(entry("passwd", "alice"), "");
+    EXPECT_FALSE(std::filesystem::exists(root + "/home/alice"));
 }
 
 TEST_F(UserLife, Groups_are_created_filled_and_deleted) {
@@ -174,6 +221,47 @@ TEST_F(UserLife, A_refused_command_fails_in_one_line_and_changes_nothing) {
     }
 }
 
+TEST_F(UserLife, A_refused_command_says_why_wherever_the_log_goes) {
+    const std::string config = scratch.write("logging.conf", "log = none\nlog.level = off\n");
+    for (const Variables& variables : {Variables{}, Variables{{"QELO_LOG_CONFIG", config}}}) {
+        const Finished administered =
+            runProcess(qelosimCommand({"delete-user", "root", "--root", root}), variables);
+        EXPECT_EQ(administered.err, "qelosim: delete-user: refused or failed, nothing was changed: "
+                                    "DeleteUser: the superuser cannot be deleted "
+                                    "(CIM_ERR_FAILED, 1)\n");
+        const Finished called = runProcess(
+            qelosimCommand({"cm", "ZANTH_Account", "DeleteUser", "Name=root", "--root", root}),
+            variables);
+        EXPECT_EQ(called.err, "qelosim: cm: Execute Method Failed: DeleteUser: the superuser "
+                              "cannot be deleted (CIM_ERR_FAILED, 1)\n");
+    }
+}
+
+TEST_F(UserLife, The_log_of_a_refusal_goes_where_the_user_wants_it) {
+    const std::string log = scratch.path("log");
+    const std::string config =
+        scratch.write("logging.conf", "log = file:" + log + "\nlog.level = 6000\n");
+    runProcess(qelosimCommand({"delete-user", "root", "--root", root}),
+               {{"QELO_LOG_CONFIG", config}});
+    EXPECT_NE(contentOf(log).find("Qelo.AdminCommand"), std::string::npos);
+    EXPECT_NE(contentOf(log).find("the superuser cannot be deleted"), std::string::npos);
+}
+
+TEST_F(UserLife, No_password_is_told_with_the_reason_of_a_refusal) {
+    for (const std::vector<std::string>& arguments :
+         std::vector<std::vector<std::string>>{{"set-password", "nobody-here"},
+                                               {"create-user", "root"},
+                                               {"create-user", "Bad:Name"}}) {
+        for (const char* password : {"xyzzy,plugh:CMPI", "xyzzy plugh"}) {
+            const Finished finished = runWithPassword(arguments, password);
+            EXPECT_EQ(finished.status, 1);
+            EXPECT_EQ(finished.err.find("xyzzy"), std::string::npos) << finished.err;
+            EXPECT_EQ(finished.err.find("plugh"), std::string::npos) << finished.err;
+            EXPECT_EQ(std::count(finished.err.begin(), finished.err.end(), '\n'), 1);
+        }
+    }
+}
+
 TEST_F(UserLife, Methods_can_be_called_under_their_own_names) {
     const Finished created =
         run({"cm", "ZANTH_Account", "CreateUser", "Name=carol", "UserID:uint32=4242"});
@@ -212,7 +300,8 @@ TEST_F(UserLife, A_node_file_takes_no_commands) {
         "nodes.json", R"({"nodes":[{"type":17,"path":"/UserAdministration/1","properties":{}}]})");
     const Finished finished = qelosim({"create-user", "eve", "--store", "file:" + file});
     EXPECT_EQ(finished.status, 1);
-    EXPECT_EQ(std::count(finished.err.begin(), finished.err.end(), '\n'), 1) << finished.err;
+    EXPECT_EQ(finished.err, "qelosim: create-user: refused or failed, nothing was changed: a node "
+                            "file takes no commands (CIM_ERR_FAILED, 1)\n");
 }
 
 TEST_F(UserLife, A_scratch_root_is_not_made_over_an_existing_one) {

@@ -1,18 +1,18 @@
 #include "LocalProviders.h"
 
 #include "../CommandContext.h"
-#include "../KnownClasses.h"
-#include "KnownSchema.h"
+#include "LocalSchema.h"
 
 #include <broker/Dispatcher.h>
 #include <broker/LocalConnection.h>
+#include <broker/Schema.h>
 
-#include <nlohmann/json.hpp>
+#include <Instrumentation.h>
 
 #include <cerrno>
 #include <cstdlib>
 #include <filesystem>
-#include <fstream>
+#include <stdexcept>
 #include <system_error>
 #include <unistd.h>
 
@@ -46,39 +46,24 @@ std::string accessProblem(const std::string& file) {
                : "cannot read " + file + ": " + std::generic_category().message(errno);
 }
 
-// The store itself can only log what it finds; a file that holds no nodes would look like a
-// system without accounts.
 std::string nodeFileProblem(const std::string& file) {
     const std::string problem = accessProblem(file);
     std::error_code error;
-    if (!problem.empty() || !std::filesystem::is_regular_file(file, error)) {
-        return problem.empty() ? file + " is not a file" : problem;
-    }
-    std::ifstream stream(file);
-    return nlohmann::json::accept(stream) ? "" : file + " is not valid JSON";
+    return problem.empty() && !std::filesystem::is_regular_file(file, error)
+               ? file + " is not a file"
+               : problem;
 }
 
-// Whether the store that counts now is the machine's own account database.
-bool changesThisMachine() {
-    const std::string root = behind(valueOfStoreVariable(), "accounts:");
-    std::error_code error;
-    return !root.empty() && std::filesystem::equivalent(root, "/", error);
-}
-
-broker::ProviderRegistration registrationOf(const KnownClass& known) {
-    broker::ProviderRegistration registration;
-    registration.className = known.className;
-    registration.nameSpaces = {"root/cimv2"};
-    registration.provider = known.provider;
-    registration.library = known.library;
-    registration.types.add(broker::ProviderType::Instance);
-    if (known.association) {
-        registration.types.add(broker::ProviderType::Association);
+// Why the store that counts now serves nothing, in its own words. Providers can only log them
+// and would show a system without accounts. What is read here is theirs too: they share it.
+std::string refusalOfStore() {
+    try {
+        Tesk::Instrumentation nodes;
+        nodes.selectNode(Tesk::NodeLexicon::UserAdministration);
+        return {};
+    } catch (const std::runtime_error& error) {
+        return error.what();
     }
-    if (known.methods) {
-        registration.types.add(broker::ProviderType::Method);
-    }
-    return registration;
 }
 
 } // namespace
@@ -90,6 +75,12 @@ std::string storeProblem(const std::string& store) {
     }
     const std::string root = behind(store, "accounts:");
     return root.empty() ? "" : accessProblem((std::filesystem::path(root) / "etc/passwd").string());
+}
+
+bool changesThisMachine() {
+    const std::string root = behind(valueOfStoreVariable(), "accounts:");
+    std::error_code error;
+    return !root.empty() && std::filesystem::equivalent(root, "/", error);
 }
 
 std::vector<std::string> providerDirectories(const Options& options) {
@@ -106,8 +97,11 @@ std::vector<std::string> providerDirectories(const Options& options) {
     return directories;
 }
 
-std::unique_ptr<client::Connection> connectToLocalProviders(const Options& options) {
-    const std::string problem = storeProblem(chooseStore(options));
+LocalObjectManager openLocalObjectManager(const Options& options) {
+    std::string problem = storeProblem(chooseStore(options));
+    if (problem.empty()) {
+        problem = refusalOfStore();
+    }
     if (!problem.empty()) {
         throw StoreError(problem);
     }
@@ -115,14 +109,19 @@ std::unique_ptr<client::Connection> connectToLocalProviders(const Options& optio
         throw StoreError("only root may change the accounts of this machine; --root DIR names "
                          "another root directory");
     }
+    LocalSchema schema = readLocalSchema(options);
     broker::DispatcherOptions dispatcherOptions;
-    dispatcherOptions.hooks.schema = knownSchema();
+    dispatcherOptions.hooks.schema = broker::schemaHooks(schema.classes);
     dispatcherOptions.libraryDirectories = providerDirectories(options);
     auto dispatcher = std::make_shared<broker::Dispatcher>(std::move(dispatcherOptions));
-    for (const KnownClass& known : knownClasses()) {
-        dispatcher->add(registrationOf(known));
-    }
-    return std::make_unique<broker::LocalConnection>(std::move(dispatcher));
+    registerProviders(schema, *dispatcher);
+    return {std::move(dispatcher), std::move(schema.classes)};
+}
+
+std::unique_ptr<client::Connection> connectToLocalProviders(const Options& options) {
+    LocalObjectManager manager = openLocalObjectManager(options);
+    return std::make_unique<broker::LocalConnection>(
+        std::move(manager.router), broker::OperationContext(), std::move(manager.repository));
 }
 
 } // namespace qelo::cli

@@ -13,6 +13,10 @@ void addRootCommand(CLI::App& app, Invocation& invocation) {
     CLI::App* command = addCommand(
         app, invocation, "init-root", "Make a scratch root directory to try commands on",
         [directory](CommandContext& context) {
+            if (!context.options().url.empty()) {
+                throw UsageError("a scratch root directory is made on this machine, not by a "
+                                 "server");
+            }
             const store::CommandOutcome outcome = store::initRoot(*directory);
             if (!outcome.accepted) {
                 throw UsageError(outcome.status);

@@ -1,9 +1,8 @@
 // For programs: one array with an object for each instance. Values keep their types; what
 // JSON has no form for (datetimes, references, infinite reals) is its text.
 #include "Display.h"
+#include "JsonValues.h"
 #include "Writer.h"
-
-#include <nlohmann/json.hpp>
 
 #include <algorithm>
 #include <charconv>
@@ -12,19 +11,17 @@
 namespace qelo::cli {
 namespace {
 
-using Json = nlohmann::ordered_json;
-
-Json instanceJson(const cim::Instance& instance);
+OrderedJson instanceJson(const cim::Instance& instance);
 
 // The number whose shortest form is the value's text, so that a real32 of 0.1 is written 0.1.
-Json realJson(const cim::Value& value) {
+OrderedJson realJson(const cim::Value& value) {
     const std::string text = value.toText();
     double number = 0;
     std::from_chars(text.data(), text.data() + text.size(), number);
-    return std::isfinite(value.asReal()) ? Json(number) : Json(text);
+    return std::isfinite(value.asReal()) ? OrderedJson(number) : OrderedJson(text);
 }
 
-Json scalarJson(const cim::Value& value) {
+OrderedJson scalarJson(const cim::Value& value) {
     switch (value.type()) {
     case cim::Type::Boolean:
         return value.asBoolean();
@@ -48,48 +45,24 @@ Json scalarJson(const cim::Value& value) {
     }
 }
 
-Json valueJson(const cim::Value& value) {
+} // namespace
+
+OrderedJson valueJson(const cim::Value& value) {
     if (value.isNull()) {
         return nullptr;
     }
     if (!value.isArray()) {
         return scalarJson(value);
     }
-    Json elements = Json::array();
+    OrderedJson elements = OrderedJson::array();
     for (const cim::Value& element : value.asArray()) {
-        elements.push_back(element.isNull() ? Json(nullptr) : scalarJson(element));
+        elements.push_back(element.isNull() ? OrderedJson(nullptr) : scalarJson(element));
     }
     return elements;
 }
 
-Json headOf(const cim::ObjectPath& path) {
-    Json object = Json::object();
-    object["class"] = path.className();
-    object["path"] = path.toText();
-    return object;
-}
-
-Json pathJson(const cim::ObjectPath& path) {
-    Json object = headOf(path);
-    Json& keys = object["keys"] = Json::object();
-    for (const auto& key : path.keys()) {
-        keys[key.name] = valueJson(key.value);
-    }
-    return object;
-}
-
-Json instanceJson(const cim::Instance& instance) {
-    Json object = headOf(instance.path());
-    Json& properties = object["properties"] = Json::object();
-    for (const auto& property : instance.properties()) {
-        properties[property.name] = valueJson(property.value);
-    }
-    return object;
-}
-
-// Readable UTF-8 where a terminal may show it, pure ASCII otherwise. Both are the same JSON.
-std::string dumped(const Json& json) {
-    constexpr auto replace = Json::error_handler_t::replace;
+std::string dumped(const OrderedJson& json) {
+    constexpr auto replace = OrderedJson::error_handler_t::replace;
     std::string text = json.dump(2, ' ', false, replace);
     std::string_view rest = text;
     while (!rest.empty()) {
@@ -100,6 +73,33 @@ std::string dumped(const Json& json) {
         rest.remove_prefix(std::min(line.size() + 1, rest.size()));
     }
     return text;
+}
+
+namespace {
+
+OrderedJson headOf(const cim::ObjectPath& path) {
+    OrderedJson object = OrderedJson::object();
+    object["class"] = path.className();
+    object["path"] = path.toText();
+    return object;
+}
+
+OrderedJson pathJson(const cim::ObjectPath& path) {
+    OrderedJson object = headOf(path);
+    OrderedJson& keys = object["keys"] = OrderedJson::object();
+    for (const auto& key : path.keys()) {
+        keys[key.name] = valueJson(key.value);
+    }
+    return object;
+}
+
+OrderedJson instanceJson(const cim::Instance& instance) {
+    OrderedJson object = headOf(instance.path());
+    OrderedJson& properties = object["properties"] = OrderedJson::object();
+    for (const auto& property : instance.properties()) {
+        properties[property.name] = valueJson(property.value);
+    }
+    return object;
 }
 
 std::string indented(const std::string& text) {
@@ -122,7 +122,7 @@ public:
     void finish() override { output_.write(empty_ ? "[]\n" : "\n]\n"); }
 
 private:
-    void add(const Json& item) {
+    void add(const OrderedJson& item) {
         output_.write(empty_ ? "[\n" : ",\n");
         output_.write(indented(dumped(item)));
         empty_ = false;
@@ -139,9 +139,9 @@ std::unique_ptr<Writer> makeJsonWriter(Output& output) {
 }
 
 std::string methodResultJson(const client::MethodResult& result) {
-    Json object = Json::object();
+    OrderedJson object = OrderedJson::object();
     object["returnValue"] = valueJson(result.returnValue);
-    Json& out = object["out"] = Json::object();
+    OrderedJson& out = object["out"] = OrderedJson::object();
     for (const auto& [name, value] : result.out) {
         out[name] = valueJson(value);
     }

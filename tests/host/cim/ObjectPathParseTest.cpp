@@ -128,5 +128,13 @@ TEST(ObjectPathParse, Every_cut_of_a_path_is_refused_or_read_without_harm) {
     }
 }
 
+TEST(ObjectPathParse, Minus_zero_is_the_same_key_as_zero) {
+    std::string error;
+    const auto path = ObjectPath::parse("C.A=-0", error);
+    ASSERT_TRUE(path) << error;
+    EXPECT_EQ(*path->key("A"), Value::unsignedInteger(Type::UInt64, 0));
+    EXPECT_EQ(ObjectPath::parse(path->toText(), error), path);
+}
+
 } // namespace
 } // namespace qelo::cim

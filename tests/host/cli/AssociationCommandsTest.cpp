@@ -56,9 +56,39 @@ TEST_F(AssociationCommands, References_know_the_result_class_and_the_role_only) 
         EXPECT_EQ(run({command, "C.K=1", "-rc", "Result", "-r", "Role"}), 0);
         EXPECT_EQ(manager.filter.resultClass, "Result");
         EXPECT_EQ(manager.filter.role, "Role");
-        EXPECT_EQ(run({command, "C.K=1", "-ac", "X"}), ExitUsage);
-        EXPECT_EQ(run({command, "C.K=1", "-rr", "X"}), ExitUsage);
     }
+}
+
+TEST_F(AssociationCommands, References_take_the_class_of_the_association_by_either_name) {
+    for (const char* command : {"rin", "ri"}) {
+        EXPECT_EQ(run({command, "C.K=1", "-ac", "Assoc"}), 0) << errors.text();
+        EXPECT_EQ(manager.filter.resultClass, "Assoc");
+        EXPECT_EQ(manager.filter.assocClass, "");
+        EXPECT_EQ(run({command, "C.K=1", "-rc", "Assoc", "-ac", "ASSOC"}), 0) << errors.text();
+        EXPECT_EQ(manager.filter.resultClass, "ASSOC");
+        EXPECT_EQ(manager.filter.assocClass, "");
+    }
+}
+
+TEST_F(AssociationCommands, Two_classes_of_one_association_are_refused) {
+    EXPECT_EQ(run({"ri", "C.K=1", "-rc", "A", "-ac", "B"}), ExitUsage);
+    EXPECT_EQ(errors.text(), "qelosim: -ac and -rc both name the class of the associations, and "
+                             "differ (see qelosim ri --help)\n");
+    EXPECT_EQ(run({"rin", "C.K=1", "-ac", "a b"}), ExitUsage);
+    EXPECT_EQ(manager.connections, 0);
+}
+
+TEST_F(AssociationCommands, References_have_no_result_role) {
+    std::string expected;
+    for (const std::string command : {"rin", "ri"}) {
+        for (const char* option : {"-rr", "--result-role"}) {
+            EXPECT_EQ(run({command, "C.K=1", option, "X"}), ExitUsage);
+            expected +=
+                "qelosim: rin and ri have no result role (see qelosim " + command + " --help)\n";
+        }
+    }
+    EXPECT_EQ(errors.text(), expected);
+    EXPECT_EQ(manager.connections, 0);
 }
 
 TEST_F(AssociationCommands, Instances_can_be_limited_to_some_properties) {

@@ -4,6 +4,7 @@
 #include <client/Connection.h>
 
 #include <exception>
+#include <functional>
 #include <memory>
 #include <string>
 #include <vector>
@@ -14,7 +15,13 @@ namespace qelo::cli {
 struct FakeManager {
     std::vector<cim::Instance> instances; // the answer to everything that lists
     client::MethodResult methodResult;
+    cim::Class cimClass;                 // the answer to getClass
+    std::vector<std::string> classNames; // and to enumerateClassNames
     std::exception_ptr failure; // thrown behind the instances
+    // What associatorNames finds instead, where it is set.
+    std::function<std::vector<cim::ObjectPath>(const cim::ObjectPath&,
+                                               const client::AssociationFilter&)>
+        associated;
 
     // The last request.
     std::string operation;
@@ -23,6 +30,7 @@ struct FakeManager {
     client::AssociationFilter filter;
     std::string method;
     client::Arguments arguments;
+    bool deep = false;
     int connections = 0;
 
     template <typename Error> void failWith(Error error) {
@@ -59,7 +67,12 @@ public:
     void associatorNames(const cim::ObjectPath& path, const client::AssociationFilter& filter,
                          const client::PathSink& sink) override {
         note("associatorNames", path, {}, filter);
-        deliverPaths(sink);
+        if (!manager_.associated) {
+            return deliverPaths(sink);
+        }
+        for (const cim::ObjectPath& found : manager_.associated(path, filter)) {
+            sink(found);
+        }
     }
     void references(const cim::ObjectPath& path, const client::AssociationFilter& filter,
                     const client::PropertyList& properties,
@@ -79,6 +92,20 @@ public:
         manager_.arguments = in;
         fail();
         return manager_.methodResult;
+    }
+    cim::Class getClass(const cim::ObjectPath& path) override {
+        note("getClass", path);
+        fail();
+        return manager_.cimClass;
+    }
+    void enumerateClassNames(const cim::ObjectPath& path, bool deep,
+                             const client::NameSink& sink) override {
+        note("enumerateClassNames", path);
+        manager_.deep = deep;
+        for (const std::string& name : manager_.classNames) {
+            sink(name);
+        }
+        fail();
     }
 
 private:

@@ -116,5 +116,16 @@ TEST_F(MethodCommands, A_method_that_fails_is_an_error) {
     EXPECT_EQ(output.text(), "");
 }
 
+TEST_F(MethodCommands, The_reason_of_a_refusal_stands_behind_the_words_of_the_provider) {
+    refusalReason = [] { return std::string("DeleteUser: there is no such account"); };
+    manager.failWith(client::CimError(1, "Execute Method Failed"));
+    EXPECT_EQ(run({"cm", "C", "M"}), 1);
+    manager.failWith(client::CimError(17, "no such method"));
+    EXPECT_EQ(run({"cm", "C", "M"}), 17);
+    EXPECT_EQ(errors.text(), "qelosim: cm: Execute Method Failed: DeleteUser: there is no such "
+                             "account (CIM_ERR_FAILED, 1)\n"
+                             "qelosim: cm: no such method (CIM_ERR_METHOD_NOT_FOUND, 17)\n");
+}
+
 } // namespace
 } // namespace qelo::cli

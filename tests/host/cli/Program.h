@@ -2,6 +2,7 @@
 #pragma once
 
 #include "FakeConnection.h"
+#include "Printing.h"
 #include "RecordingOutput.h"
 
 #include <cli/Application.h>
@@ -9,6 +10,7 @@
 
 #include <gtest/gtest.h>
 
+#include <functional>
 #include <string>
 #include <vector>
 
@@ -26,7 +28,7 @@ protected:
             return std::make_unique<FakeConnection>(manager);
         };
         return runApplication(static_cast<int>(pointers.size()), pointers.data(),
-                              {connect, output, errors});
+                              {connect, output, errors, furtherCommands, groupIds, refusalReason});
     }
 
     // The options that reached the object manager.
@@ -35,6 +37,9 @@ protected:
     FakeManager manager;
     RecordingOutput output;
     RecordingOutput errors;
+    std::vector<std::function<void(CLI::App&, Invocation&)>> furtherCommands;
+    GroupIds groupIds;
+    RefusalReason refusalReason;
 
 private:
     Options options_;

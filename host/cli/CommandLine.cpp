@@ -65,10 +65,11 @@ std::vector<CLI::Option*> addServerOptions(CLI::App& app, Options& options) {
 } // namespace
 
 void checkCommonOptions(const Options& options) {
-    const bool local = !options.store.empty() || !options.providerDirectories.empty();
+    const bool local = !options.store.empty() || !options.providerDirectories.empty() ||
+                       !options.schemaDirectories.empty();
     if (!options.url.empty() && local) {
-        throw UsageError("--url asks a server; --store, --root and --provider-dir are for "
-                         "providers in this process");
+        throw UsageError("--url asks a server; --store, --root, --provider-dir and --schema-dir "
+                         "are for providers in this process");
     }
     const bool remote =
         !options.passwordFile.empty() || !options.caCertificate.empty() || options.insecure;

@@ -219,7 +219,7 @@ MethodResult HttpConnection::send(cimxml::Request request, cimxml::ResponseSinks
         throw CimError(invalidNamespace, "no namespace is given");
     }
     request.messageId = std::to_string(++lastMessage_);
-    HttpRequest message = {request.method, objectOf(request), {}};
+    HttpRequest message = {request.method, objectOf(request), {}, !request.extrinsic};
     cimxml::writeRequest(message.body, request);
     cimxml::ResponseReader reader(std::move(sinks));
     transport_.post(message, [&](std::string_view piece) { reader.feed(piece); });

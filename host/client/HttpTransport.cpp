@@ -164,6 +164,7 @@ public:
         set(handle_, CURLOPT_HTTPHEADER, fields.get());
         set(handle_, CURLOPT_POSTFIELDSIZE_LARGE, static_cast<curl_off_t>(request.body.size()));
         set(handle_, CURLOPT_POSTFIELDS, request.body.data());
+        set(handle_, CURLOPT_FRESH_CONNECT, request.repeatable ? 0L : 1L);
         set(handle_, CURLOPT_HEADERDATA, &exchange);
         set(handle_, CURLOPT_WRITEDATA, &exchange);
         set(handle_, CURLOPT_XFERINFODATA, &exchange);

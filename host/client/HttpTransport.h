@@ -24,6 +24,9 @@ struct HttpRequest {
     std::string method; // CIMMethod
     std::string object; // CIMObject, not yet encoded
     std::string body;
+    // Whether asking twice does no harm. If so, a kept connection is used, and the request is
+    // sent again when it turns out to be dead.
+    bool repeatable = true;
 };
 
 class HttpTransport {

@@ -52,6 +52,7 @@ public:
     Value parsed(const Value& value, Type type, const std::string& what) const;
 
 private:
+    cim::ObjectPath withKeyNamed(const cim::ObjectPath& path, const cim::Class& known) const;
     Value reference(const std::string& text, const std::string& what, int depth) const;
     static Value fromText(const std::string& text, Type type, const std::string& what);
 
@@ -112,6 +113,18 @@ Value Typing::parsed(const Value& value, Type type, const std::string& what) con
     return fromText(value.asString(), type, what);
 }
 
+// The protocol allows the only key of a class to come without its name.
+cim::ObjectPath Typing::withKeyNamed(const cim::ObjectPath& path, const cim::Class& known) const {
+    const std::vector<std::string> names = repository_.keyNames(known);
+    if (names.size() != 1) {
+        refuse("class " + known.name + " has not one key; name them");
+    }
+    cim::ObjectPath result = path;
+    result.clearKeys();
+    result.setKey(names[0], path.keys()[0].value);
+    return result;
+}
+
 cim::ObjectPath Typing::path(const cim::ObjectPath& path, int depth) const {
     if (depth > kDeepestReference) {
         refuse("references are nested too deeply");
@@ -120,6 +133,9 @@ cim::ObjectPath Typing::path(const cim::ObjectPath& path, int depth) const {
     const cim::Class* known = repository_.find(nameSpace, path.className());
     if (known == nullptr) {
         return path;
+    }
+    if (path.keys().size() == 1 && path.keys()[0].name.empty()) {
+        return this->path(withKeyNamed(path, *known), depth);
     }
     cim::ObjectPath result = path;
     for (const cim::ObjectPath::Key& key : path.keys()) {

@@ -57,6 +57,17 @@ TEST_F(SchemaTest, Static_instances_are_served_beside_the_providers) {
     EXPECT_THAT(finished.out, HasSubstr("Text = \"hello\""));
 }
 
+TEST_F(SchemaTest, Classes_are_known_in_every_namespace_that_a_provider_serves) {
+    const std::string registration = "[Note]\nprovider: P\nlocation: none\ntype: instance\n"
+                                     "namespace: root/other root/third\n";
+    for (const char* nameSpace : {"root/cimv2", "root/other", "ROOT/third"}) {
+        const Finished finished = runWith("class Note { [Key] string Id; };", registration,
+                                          {"gc", "Note", "--namespace", nameSpace});
+        EXPECT_EQ(finished.status, 0) << nameSpace << finished.err;
+    }
+    EXPECT_EQ(runWith("", registration, {"ecn", "--namespace", "root/fourth"}).status, 3);
+}
+
 TEST_F(SchemaTest, A_key_of_another_type_is_refused) {
     EXPECT_EQ(run({"gi", "ZANTH_Account.Name=5"}).status, 4);
     EXPECT_EQ(run({"gi", "ZANTH_Account.UserID=\"0\""}).status, 4);

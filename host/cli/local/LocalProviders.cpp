@@ -91,9 +91,11 @@ std::vector<std::string> providerDirectories(const Options& options) {
     std::error_code error;
     const auto executable = std::filesystem::read_symlink("/proc/self/exe", error);
     if (!error) {
-        directories.push_back((executable.parent_path().parent_path() / "lib").string());
+        const auto prefix = executable.parent_path().parent_path();
+        directories.push_back((prefix / "lib/cmpi").string()); // where it is installed
+        directories.push_back((prefix / "lib").string());      // where it is built
     }
-    directories.emplace_back(QELO_INSTALL_LIBDIR);
+    directories.emplace_back(QELO_INSTALL_PROVIDER_DIR);
     return directories;
 }
 
@@ -115,7 +117,12 @@ LocalObjectManager openLocalObjectManager(const Options& options) {
     dispatcherOptions.libraryDirectories = providerDirectories(options);
     auto dispatcher = std::make_shared<broker::Dispatcher>(std::move(dispatcherOptions));
     registerProviders(schema, *dispatcher);
-    return {std::move(dispatcher), std::move(schema.classes)};
+    LocalObjectManager manager = {std::move(dispatcher), std::move(schema.classes), {}};
+    for (const LocalSchema::Registrations& source : schema.registrations) {
+        const auto& warnings = source.file.warnings;
+        manager.warnings.insert(manager.warnings.end(), warnings.begin(), warnings.end());
+    }
+    return manager;
 }
 
 std::unique_ptr<client::Connection> connectToLocalProviders(const Options& options) {

@@ -18,6 +18,7 @@ namespace qelo::cli {
 struct LocalObjectManager {
     std::shared_ptr<broker::Router> router;
     std::shared_ptr<const schema::ClassRepository> repository;
+    std::vector<std::string> warnings; // one line each about what the registrations say
 };
 
 // Knows the classes and the providers that the schema names. Puts the store of the options

@@ -2,8 +2,10 @@
 
 #include "../CommandContext.h"
 
+#include <broker/ProviderRegistry.h>
 #include <schema/Mof.h>
 
+#include <algorithm>
 #include <filesystem>
 #include <stdexcept>
 #include <system_error>
@@ -11,8 +13,39 @@
 namespace qelo::cli {
 namespace {
 
-// Classes without a namespace of their own are in this one.
+// Every object manager has it.
 constexpr char kNameSpace[] = "root/cimv2";
+
+using Registrations = std::vector<LocalSchema::Registrations>;
+
+Registrations readRegistrations(const std::vector<std::string>& folders) {
+    Registrations result;
+    for (const std::string& folder : folders) {
+        for (const auto& file : schema::schemaFiles(folder, ".reg")) {
+            result.push_back({file.string(), broker::parseRegistrations(
+                                                 file.string(), schema::readSchemaFile(file))});
+        }
+    }
+    return result;
+}
+
+// The namespaces that providers serve: classes are known in each of them.
+std::vector<std::string> nameSpacesOf(const Registrations& registrations) {
+    std::vector<std::string> names = {kNameSpace};
+    for (const auto& source : registrations) {
+        for (const auto& registration : source.file.registrations) {
+            for (const std::string& name : registration.nameSpaces) {
+                const bool known = std::any_of(names.begin(), names.end(), [&](const auto& other) {
+                    return broker::sameNameSpace(name, other);
+                });
+                if (!known) {
+                    names.push_back(name);
+                }
+            }
+        }
+    }
+    return names;
+}
 
 } // namespace
 
@@ -34,13 +67,12 @@ std::vector<std::string> schemaDirectories(const Options& options) {
 LocalSchema readLocalSchema(const Options& options) {
     LocalSchema result;
     schema::ClassRepository classes;
+    const std::vector<std::string> folders = schemaDirectories(options);
     try {
-        for (const std::string& folder : schemaDirectories(options)) {
-            schema::loadMofFolder(folder, kNameSpace, classes);
-            for (const auto& file : schema::schemaFiles(folder, ".reg")) {
-                result.registrations.push_back(
-                    {file.string(),
-                     broker::parseRegistrations(file.string(), schema::readSchemaFile(file))});
+        result.registrations = readRegistrations(folders);
+        for (const std::string& nameSpace : nameSpacesOf(result.registrations)) {
+            for (const std::string& folder : folders) {
+                schema::loadMofFolder(folder, nameSpace, classes);
             }
         }
     } catch (const schema::SchemaError& error) {

@@ -176,6 +176,9 @@ void serve(CommandContext& context, const ServeOptions& options) {
     const ListenAddress address = listenAddressOf(options);
     server::ServerOptions serverOptions = serverOptionsOf(options, address);
     const LocalObjectManager manager = openLocalObjectManager(context.options());
+    for (const std::string& warning : manager.warnings) {
+        logLine("warning: " + warning);
+    }
     const auto operations = std::make_shared<const server::Operations>(server::Operations::Services{
         manager.router, manager.repository, permissionOf(options), hostName()});
     const EndRequest endRequest;

@@ -17,7 +17,7 @@ struct FakeManager {
     client::MethodResult methodResult;
     cim::Class cimClass;                 // the answer to getClass
     std::vector<std::string> classNames; // and to enumerateClassNames
-    std::exception_ptr failure; // thrown behind the instances
+    std::exception_ptr failure;          // thrown behind the instances
     // What associatorNames finds instead, where it is set.
     std::function<std::vector<cim::ObjectPath>(const cim::ObjectPath&,
                                                const client::AssociationFilter&)>

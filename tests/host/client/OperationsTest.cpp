@@ -159,6 +159,17 @@ TEST_F(Operations, Methods_take_and_return_typed_values) {
     EXPECT_EQ(lastRequest().target.toText(), "root/cimv2:Account");
 }
 
+// A request that is sent again when a kept connection turns out to be dead could do twice what
+// it does.
+TEST_F(Operations, Methods_never_use_a_kept_connection) {
+    answerWith([](const cimxml::ResponseWriter& writer, std::string& body) {
+        writer.methodResult(body, {});
+    });
+    connection().invokeMethod(account(), "Make", {});
+    connection().invokeMethod(account(), "Make", {});
+    EXPECT_EQ(requests().back().connection, 2);
+}
+
 TEST_F(Operations, Classes_and_their_names_are_asked_for) {
     answerWith([](const cimxml::ResponseWriter& writer, std::string& body) {
         cim::Class declaration;

@@ -78,13 +78,20 @@ std::vector<SeenRequest> ScriptedServer::requests() const {
     return requests_;
 }
 
+// A client may open a second connection while it keeps the first.
 void ScriptedServer::run() {
+    std::vector<std::thread> connections;
     for (int number = 1; waitFor(listener_, stop_[0]); ++number) {
         const int socket = accept4(listener_, nullptr, nullptr, SOCK_CLOEXEC);
         if (socket >= 0) {
-            serve(socket, number);
-            close(socket);
+            connections.emplace_back([this, socket, number] {
+                serve(socket, number);
+                close(socket);
+            });
         }
+    }
+    for (std::thread& connection : connections) {
+        connection.join();
     }
 }
 

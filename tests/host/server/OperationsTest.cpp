@@ -3,6 +3,7 @@
 #include "RequestText.h"
 #include "TestSchema.h"
 
+#include <server/LocalReferences.h>
 #include <server/Operations.h>
 
 #include <gmock/gmock.h>
@@ -222,6 +223,19 @@ TEST_F(OperationsTest, An_unknown_namespace_is_an_invalid_one) {
     EXPECT_THAT(answer(intrinsicRequest("EnumerateClassNames", "", "root/other")), isError(3));
 }
 
+TEST_F(OperationsTest, Blanks_around_a_boolean_do_not_count) {
+    const std::string all = intrinsic("GetClass", classNameParameter("TEST_Thing") +
+                                                      textParameter("LocalOnly", " false\n"));
+    EXPECT_THAT(all, HasSubstr("NAME=\"Id\""));
+}
+
+TEST_F(OperationsTest, The_only_key_of_a_class_needs_no_name) {
+    intrinsic("GetInstance",
+              "<IPARAMVALUE NAME=\"InstanceName\"><INSTANCENAME CLASSNAME=\"TEST_Thing\"><KEYVALUE "
+              "VALUETYPE=\"string\">1</KEYVALUE></INSTANCENAME></IPARAMVALUE>");
+    EXPECT_THAT(router_->asked(), ElementsAre("GetInstance root/test:TEST_Thing.Id=\"1\""));
+}
+
 TEST_F(OperationsTest, Parameters_of_the_wrong_kind_are_invalid) {
     EXPECT_THAT(intrinsic("EnumerateInstances", ""), isError(4));
     EXPECT_THAT(intrinsic("EnumerateInstances",
@@ -234,6 +248,41 @@ TEST_F(OperationsTest, Parameters_of_the_wrong_kind_are_invalid) {
                           classNameParameter("TEST_Thing") + classNameParameter("TEST_Thing")),
                 isError(4));
     EXPECT_THAT(intrinsic("GetInstance", textParameter("InstanceName", "1")), isError(4));
+}
+
+// References inside answers.
+
+cim::ObjectPath linkTo(const std::string& host) {
+    cim::ObjectPath target = FakeRouter::path(1);
+    target.setHost(host);
+    cim::ObjectPath link("root/test", "TEST_Link");
+    link.setKey("Near", cim::Value::reference(target));
+    return link;
+}
+
+TEST(LocalReferences, Lose_the_name_of_this_host_only) {
+    const auto here = withLocalReferences(linkTo("host.test"), "host.test");
+    ASSERT_TRUE(here);
+    EXPECT_EQ(here->key("Near")->asReference().host(), "");
+    EXPECT_EQ(here->key("Near")->asReference(), FakeRouter::path(1));
+    const auto elsewhere = withLocalReferences(linkTo("other.test"), "host.test");
+    ASSERT_TRUE(elsewhere);
+    EXPECT_EQ(elsewhere->key("Near")->asReference().host(), "other.test");
+}
+
+TEST(LocalReferences, Properties_lose_it_too_and_the_rest_stays) {
+    cim::Instance instance(FakeRouter::path(1));
+    EXPECT_FALSE(withLocalReferences(instance, "host.test"));
+    instance.setProperty("Text", cim::Value::string("host.test"));
+    instance.setProperty("Far", *linkTo("HOST.test").key("Near"), "TEST_Base");
+    instance.setProperty("Unset", cim::Value::null(cim::Type::Reference));
+    const auto local = withLocalReferences(instance, "host.test");
+    ASSERT_TRUE(local);
+    EXPECT_EQ(local->property("Far")->asReference().host(), "");
+    EXPECT_EQ(local->properties()[1].origin, "TEST_Base");
+    EXPECT_EQ(local->property("Text")->asString(), "host.test");
+    EXPECT_TRUE(local->property("Unset")->isNull());
+    EXPECT_EQ(*local, instance);
 }
 
 TEST_F(OperationsTest, An_error_after_results_takes_their_place) {

@@ -20,8 +20,10 @@ set(qelo_provider_targets qelosimpleidentitymanagementprofileprovider qelocomput
 set(qelo_platform_targets qeloinstrumentationenvelope qeloCvLogger qeloteskcommon qelotesklocale
   qeloproviderutilities)
 
+# The last place is for object managers that want links in a folder of their own: $ORIGIN is
+# the folder of the link then.
 set_target_properties(${qelo_provider_targets} PROPERTIES
-  INSTALL_RPATH "$ORIGIN;$ORIGIN/../qelosim")
+  INSTALL_RPATH "$ORIGIN;$ORIGIN/../qelosim;${CMAKE_INSTALL_PREFIX}/${QELO_PRIVATE_DIR}")
 set_target_properties(${qelo_platform_targets} PROPERTIES INSTALL_RPATH "$ORIGIN")
 set_target_properties(qelosim PROPERTIES INSTALL_RPATH "$ORIGIN/../${QELO_PRIVATE_DIR}")
 

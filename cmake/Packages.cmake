@@ -1,7 +1,8 @@
 # Debian packages, made by tools/package: qelosim-platform, qelosim-provider, qelosim-host, and
 # qelosim, which is all of them.
 set(CPACK_GENERATOR DEB)
-set(CPACK_PACKAGE_DESCRIPTION_SUMMARY "CIM management of local accounts and groups")
+# Each package has a summary of its own.
+set(CPACK_PACKAGE_DESCRIPTION_SUMMARY "")
 set(CPACK_PACKAGE_NAME qelosim)
 set(CPACK_PACKAGE_VENDOR "qelosim")
 set(CPACK_PACKAGE_CONTACT "qelosim developers <developers@qelosim.test>")

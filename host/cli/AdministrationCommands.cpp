@@ -12,6 +12,11 @@
 namespace qelo::cli {
 namespace {
 
+// The provider refuses some arguments by itself, without a word to anybody.
+constexpr char kReasonElsewhere[] =
+    "; an argument holds a comma, a control character or more than 255 bytes, or the log of the "
+    "providers says why: ";
+
 enum class Kind { Text, Number, Flag, Day, PasswordLine };
 
 // An option, and the argument of the method that carries it.
@@ -235,7 +240,7 @@ client::Arguments argumentsOf(const Request& request) {
     throw client::CimError(
         error.code(),
         "refused or failed, nothing was changed" +
-            (reason.empty() ? std::string("; the log says why: ") + error.what() : ": " + reason));
+            (reason.empty() ? std::string(kReasonElsewhere) + error.what() : ": " + reason));
 }
 
 void administer(CommandContext& context, const Request& request) {

@@ -172,8 +172,10 @@ TEST_F(AdministrationCommands, A_refusal_is_told_with_its_reason_where_that_is_k
 
 TEST_F(AdministrationCommands, A_refusal_without_a_known_reason_points_at_the_log) {
     manager.failWith(client::CimError(1, "Execute Method Failed"));
-    const std::string expected = "qelosim: delete-user: refused or failed, nothing was changed; "
-                                 "the log says why: Execute Method Failed (CIM_ERR_FAILED, 1)\n";
+    const std::string expected =
+        "qelosim: delete-user: refused or failed, nothing was changed; "
+        "an argument holds a comma, a control character or more than 255 bytes, "
+        "or the log of the providers says why: Execute Method Failed (CIM_ERR_FAILED, 1)\n";
     EXPECT_EQ(run({"delete-user", "al"}), 1);
     EXPECT_EQ(errors.text(), expected);
     refusalReason = [] { return std::string(); };

@@ -124,7 +124,10 @@ public:
     void add(Arena& arena, std::string_view name);
     bool has(std::string_view name, std::uint32_t hash) const;
     bool empty() const { return names_.empty(); }
-    void clear() { names_.clear(); }
+    void clear() {
+        names_.clear();
+        hashes_.clear();
+    }
     const StringObject* const* begin() const { return names_.begin(); }
     const StringObject* const* end() const { return names_.end(); }
 

@@ -8,6 +8,8 @@ namespace {
 constexpr unsigned int kBadRequest = 400;
 constexpr unsigned int kNotImplemented = 501;
 
+constexpr std::size_t kMostArguments = 256;
+
 // The version of a standard: all that is asked of it is its first number.
 void requireMajorVersion(std::string_view version, char major, const char* cimError) {
     version = trimmed(version);
@@ -96,9 +98,23 @@ private:
             }
             if (request.extrinsic) {
                 request.extrinsicParameters.push_back(extrinsic(child));
+                refuseRepetition(request.extrinsicParameters);
             } else {
                 request.intrinsicParameters.push_back(parameter(child));
             }
+        }
+    }
+
+    // Whether the last one has the name of one before it.
+    static void refuseRepetition(const std::vector<ExtrinsicParameter>& parameters) {
+        const auto& last = parameters.back();
+        for (std::size_t i = 0; i + 1 < parameters.size(); ++i) {
+            if (cim::sameName(parameters[i].name, last.name)) {
+                throw NotValid("the argument " + last.name + " is given twice");
+            }
+        }
+        if (parameters.size() > kMostArguments) {
+            throw NotValid("there are too many arguments");
         }
     }
 

@@ -2,13 +2,16 @@
 
 #include <cstdlib>
 #include <cstring>
+#include <malloc.h>
 #include <new>
+#include <poll.h>
 #include <utility>
 
 namespace qelo::server {
 namespace {
 
 constexpr unsigned int kOk = 200;
+constexpr unsigned int kBadRequest = 400;
 constexpr unsigned int kUnauthorized = 401;
 constexpr unsigned int kTooLarge = 413;
 constexpr unsigned int kHeaderTooLarge = 431;
@@ -21,6 +24,9 @@ constexpr char kRealm[] = "Basic realm=\"qelosim\"";
 // A refused body up to this is read to its end, so that the client gets to see the answer
 // and may go on; for a larger one the connection is closed.
 constexpr std::size_t kReadInSpite = 64 * 1024;
+
+// Providers make an answer of this size out of memory that is worth giving back.
+constexpr std::size_t kLargeAnswer = 8 * 1024 * 1024;
 
 constexpr std::size_t kAnswerBlock = 32 * 1024;
 // The time that a client has for each piece of an answer.
@@ -83,7 +89,36 @@ HttpRefusal Exchange::checkHeader(const std::string& method, const std::string& 
     if (server_.stopping) {
         return {kUnavailable, "the server is shutting down", ""};
     }
-    return checkRequestHeader(method, path, headerLookup(), server_.options.limits.body);
+    const HttpRefusal repeated = checkSingleHeaders();
+    return repeated ? repeated
+                    : checkRequestHeader(method, path, headerLookup(), server_.options.limits.body);
+}
+
+// What stands between here and the client may go by another of two values than we do.
+HttpRefusal Exchange::checkSingleHeaders() const {
+    struct Count {
+        const char* name;
+        int found;
+    };
+    for (const char* const name : {"CIMOperation", "CIMMethod", "CIMObject", "CIMProtocolVersion",
+                                   "Content-Type", "Content-Length", "Authorization"}) {
+        Count count = {name, 0};
+        const auto look = [](void* data, MHD_ValueKind, const char* key,
+                             const char*) -> MHD_Result {
+            auto& counted = *static_cast<Count*>(data);
+            counted.found += cim::sameName(key, counted.name) ? 1 : 0;
+            return MHD_YES;
+        };
+        MHD_get_connection_values(connection_, MHD_HEADER_KIND, look, &count);
+        if (count.found > 1) {
+            return {kBadRequest, std::string(name) + " is given twice", ""};
+        }
+    }
+    const auto header = headerLookup();
+    if (header("Content-Length") && header("Transfer-Encoding")) {
+        return {kBadRequest, "both Content-Length and Transfer-Encoding are given", ""};
+    }
+    return {};
 }
 
 MHD_Result Exchange::begin(const std::string& method, const std::string& path) {
@@ -226,14 +261,32 @@ void Exchange::startOperation() {
     }
 }
 
+// A connection that waits is not looked at by the library. A client that has only finished
+// sending may still want its answer.
+bool Exchange::clientHasGone() const {
+    pollfd item = {socket(), 0, 0};
+    return poll(&item, 1, 0) == 1 && (item.revents & (POLLHUP | POLLERR)) != 0;
+}
+
 // In a worker thread.
 void Exchange::runOperation() {
-    const AnswerSink sink = {[this](std::string_view piece) { stream_->write(piece); },
+    if (clientHasGone()) {
+        dropBody();
+        stream_->fail();
+        return;
+    }
+    const AnswerSink sink = {[this](std::string_view piece) {
+                                 answered_ += piece.size();
+                                 stream_->write(piece);
+                             },
                              [this] { return stream_->restart(); }};
     try {
         answer(sink);
         dropBody();
         stream_->finish();
+        if (answered_ > kLargeAnswer) {
+            malloc_trim(0);
+        }
         return;
     } catch (const ResponseAbandoned&) {
         // The client knows.
@@ -298,9 +351,17 @@ MHD_Response* Exchange::streamedAnswer() {
 
 ssize_t Exchange::readAnswer(void* exchange, std::uint64_t, char* buffer, std::size_t size) {
     Exchange& self = **static_cast<std::shared_ptr<Exchange>*>(exchange);
-    const ssize_t got = self.stream_->read(
-        buffer, size, [&] { MHD_suspend_connection(self.connection_); },
-        [&self] { self.resume(); });
+    // Waiting for the provider is not the client's fault.
+    const auto pause = [&self] {
+        self.paused_ = true;
+        self.server_.watch.allowForEver(self.socket());
+        MHD_suspend_connection(self.connection_);
+    };
+    if (std::exchange(self.paused_, false)) {
+        self.sinceAllowance_ = 0;
+        self.server_.watch.allow(self.socket(), kPieceTime);
+    }
+    const ssize_t got = self.stream_->read(buffer, size, pause, [&self] { self.resume(); });
     if (got > 0) {
         // A client that goes on taking may go on.
         self.sinceAllowance_ += static_cast<std::size_t>(got);

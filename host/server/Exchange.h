@@ -54,6 +54,8 @@ private:
                               std::size_t size);
     static void dropAnswer(void* exchange);
     int socket() const;
+    bool clientHasGone() const;
+    HttpRefusal checkSingleHeaders() const;
     void dropBody();
 
     ServerState& server_;
@@ -65,7 +67,9 @@ private:
     std::string user_;
     std::string body_;
     std::size_t discarded_ = 0;
+    std::size_t answered_ = 0; // bytes that the operation has written
     std::size_t sinceAllowance_ = 0;
+    bool paused_ = false; // in the middle of an answer, for want of more of it
     std::shared_ptr<ResponseStream> stream_;
 };
 

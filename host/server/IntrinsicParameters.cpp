@@ -9,6 +9,9 @@ namespace {
 
 constexpr unsigned int kInvalidParameter = 4;
 
+// No class of any schema has so many properties.
+constexpr std::size_t kMostProperties = 256;
+
 [[noreturn]] void refuse(const std::string& name, const std::string& problem) {
     throw client::CimError(kInvalidParameter, "parameter " + name + ": " + problem);
 }
@@ -111,10 +114,13 @@ client::PropertyList IntrinsicParameters::propertyList() const {
         return std::nullopt;
     }
     std::vector<std::string> names;
-    names.reserve(list->size());
     for (const auto& item : *list) {
         if (!item) {
             refuse(name, "a name is NULL");
+        }
+        // Every instance is held against the list: a long one would keep a worker busy.
+        if (names.size() == kMostProperties) {
+            refuse(name, "more than " + std::to_string(kMostProperties) + " names");
         }
         names.push_back(*item);
     }

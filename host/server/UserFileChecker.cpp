@@ -89,7 +89,7 @@ public:
             const auto users = readUsers(path_);
             const auto found = users.find(user);
             if (found == users.end()) {
-                hashesTo(password, kNobodysHash);
+                hashesTo(password, users.empty() ? kNobodysHash : users.begin()->second);
                 return false;
             }
             return hashesTo(password, found->second);

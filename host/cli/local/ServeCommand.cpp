@@ -12,6 +12,7 @@
 #include <cstdio>
 #include <fstream>
 #include <iterator>
+#include <malloc.h>
 #include <memory>
 #include <stdexcept>
 #include <string>
@@ -170,6 +171,9 @@ server::ServerOptions serverOptionsOf(const ServeOptions& options, const ListenA
 }
 
 void serve(CommandContext& context, const ServeOptions& options) {
+    // Memory of a large answer is to go back to the system; with an arena for each worker much
+    // of it would stay.
+    mallopt(M_ARENA_MAX, 2);
     // Passwords pass through this process; they are not to end up in a core image.
     const rlimit none = {0, 0};
     setrlimit(RLIMIT_CORE, &none);

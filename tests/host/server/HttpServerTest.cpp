@@ -374,6 +374,48 @@ TEST_F(HttpServerTest, Headers_that_contradict_the_body_are_refused) {
     EXPECT_THAT(router_->asked(), IsEmpty());
 }
 
+TEST_F(HttpServerTest, A_header_that_says_two_things_is_refused) {
+    start();
+    for (const char* more : {"CIMObject: root%2Fother\r\n", "cimmethod: DeleteInstance\r\n",
+                             "Content-Type: text/xml\r\n", "Transfer-Encoding: chunked\r\n"}) {
+        Post post = listing();
+        post.furtherHeaders = more;
+        const int status = ask(post).status;
+        EXPECT_TRUE(status == 400 || status == 0) << more << status;
+    }
+    EXPECT_THAT(router_->asked(), IsEmpty());
+    expectStillServing();
+}
+
+TEST_F(HttpServerTest, A_client_that_reset_its_connection_is_not_worked_for) {
+    limits_.workers = 1;
+    std::promise<void> go;
+    auto gate = go.get_future().share();
+    std::atomic<int> asked{0};
+    router_->beforeResult = [&](std::size_t index) {
+        asked += index == 0 ? 1 : 0;
+        gate.wait();
+    };
+    start();
+    RawClient first = connect();
+    first.send(instances().text());
+    while (asked == 0) {
+        std::this_thread::sleep_for(1ms);
+    }
+    {
+        RawClient gone = connect();
+        gone.send(instances().text());
+        std::this_thread::sleep_for(100ms); // until it waits for the worker
+        gone.resetWhenClosed();
+    }
+    RawClient last = connect();
+    last.send(listing().text());
+    go.set_value();
+    EXPECT_EQ(first.receive().status, 200);
+    EXPECT_EQ(last.receive().status, 200);
+    EXPECT_EQ(asked, 2);
+}
+
 TEST_F(HttpServerTest, Garbage_instead_of_http_is_survived) {
     limits_.idle = 1s;
     start();

@@ -75,6 +75,19 @@ TEST_F(OperationsTest, Instances_are_enumerated_with_a_property_list) {
     EXPECT_THAT(text, HasSubstr("<VALUE.NAMEDINSTANCE>"));
 }
 
+TEST_F(OperationsTest, A_property_list_without_end_is_refused) {
+    std::string names;
+    for (int i = 0; i < 257; ++i) {
+        names += "<VALUE>P" + std::to_string(i) + "</VALUE>";
+    }
+    EXPECT_THAT(
+        intrinsic("EnumerateInstances", classNameParameter("TEST_Thing") +
+                                            "<IPARAMVALUE NAME=\"PropertyList\"><VALUE.ARRAY>" +
+                                            names + "</VALUE.ARRAY></IPARAMVALUE>"),
+        isError(4));
+    EXPECT_TRUE(router_->asked().empty());
+}
+
 TEST_F(OperationsTest, Without_a_property_list_all_properties_are_asked_for) {
     intrinsic("EnumerateInstances", classNameParameter("TEST_Base"));
     EXPECT_FALSE(router_->lastProperties);

@@ -55,6 +55,11 @@ bool RawClient::send(std::string_view bytes) const {
 
 void RawClient::finishSending() const { shutdown(socket_, SHUT_WR); }
 
+void RawClient::resetWhenClosed() const {
+    const linger now = {1, 0};
+    setsockopt(socket_, SOL_SOCKET, SO_LINGER, &now, sizeof now);
+}
+
 bool RawClient::readMore(Clock::time_point end) {
     pollfd item = {socket_, POLLIN, 0};
     if (poll(&item, 1, millisecondsUntil(end)) != 1) {

@@ -23,6 +23,8 @@ public:
     // False when the server does not take it any more.
     bool send(std::string_view bytes) const;
     void finishSending() const;
+    // Closing the connection will tell the other side that something went wrong.
+    void resetWhenClosed() const;
 
     struct Answer {
         int status = 0; // 0: the server closed the connection without an answer

@@ -35,20 +35,6 @@ Descriptor takeLibraryLock(const RootDirectory& root, FileSystem& files, Clock::
     return file;
 }
 
-// Whether the process that wrote the lock is gone. A lock that cannot be understood counts as
-// held, as it does for the tools. One with our own number was left by an earlier process of
-// that number: within this process the store's own lock lets only one command come here.
-bool isStale(FileSystem& files, int etc, const std::string& lock) {
-    const Attempt<std::string> text = readSmallFile(files, etc, lock);
-    pid_t holder = 0;
-    if (!text ||
-        std::from_chars(text->data(), text->data() + text->size(), holder).ec != std::errc() ||
-        holder <= 0) {
-        return false;
-    }
-    return holder == ::getpid() || (::kill(holder, 0) != 0 && errno == ESRCH);
-}
-
 // Makes the file that is to be linked to the lock's name.
 bool makeHolderFile(FileSystem& files, int etc, const std::string& name) {
     files.removeFile(etc, name);
@@ -66,7 +52,7 @@ Linked tryLink(FileSystem& files, int etc, const std::string& holder, const std:
     if (errno != EEXIST) {
         return Linked::Failed;
     }
-    if (isStale(files, etc, lock)) {
+    if (isStaleLock(files, etc, lock)) {
         files.removeFile(etc, lock);
     }
     return Linked::Held;
@@ -119,6 +105,20 @@ AccountFileLock::~AccountFileLock() {
     if (!name_.empty()) {
         removeSurely(*files_, etc_, name_ + ".lock");
     }
+}
+
+// A lock that cannot be understood counts as held, as it does for the tools. One with our own
+// number was left by an earlier process of that number: within this process the store's own
+// lock lets only one command come here.
+bool isStaleLock(FileSystem& files, int etc, const std::string& lock) {
+    const Attempt<std::string> text = readSmallFile(files, etc, lock);
+    pid_t holder = 0;
+    if (!text ||
+        std::from_chars(text->data(), text->data() + text->size(), holder).ec != std::errc() ||
+        holder <= 0) {
+        return false;
+    }
+    return holder == ::getpid() || (::kill(holder, 0) != 0 && errno == ESRCH);
 }
 
 } // namespace qelo::store

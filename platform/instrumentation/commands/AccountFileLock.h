@@ -34,4 +34,9 @@ private:
     Descriptor libraryLock_;
 };
 
+// Whether the process is gone that wrote a lock file, or the file that is linked to a lock's
+// name; `lock` is its name in the open directory `etc`. One that cannot be understood counts as
+// held.
+bool isStaleLock(FileSystem& files, int etc, const std::string& lock);
+
 } // namespace qelo::store

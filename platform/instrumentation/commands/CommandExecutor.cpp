@@ -4,6 +4,7 @@
 #include "GroupCommands.h"
 #include "PasswordHash.h"
 #include "StoreLock.h"
+#include "ToolRests.h"
 #include "UserCommands.h"
 
 namespace qelo::store {
@@ -65,7 +66,10 @@ Attempt<std::string> carryOut(const std::filesystem::path& rootPath, CommandRequ
     if (!lock) {
         return lock.refusal();
     }
-    return dispatch({*root, files, tools}, request, hash->empty() ? nullptr : &*hash);
+    Attempt<std::string> status =
+        dispatch({*root, files, tools}, request, hash->empty() ? nullptr : &*hash);
+    removeToolRests(*root, files);
+    return status;
 }
 
 } // namespace

@@ -63,13 +63,52 @@ Range rangeAround(void* address) {
     return dladdr(address, &info) != 0 ? rangeOf(info.dli_fname) : Range{};
 }
 
+// The blocks that are in use, in the order of their making. In memory of its own, since it is
+// called from the operators themselves.
+class Ledger {
+public:
+    ~Ledger() { std::free(blocks_); }
+
+    void clear() { used_ = 0; }
+    std::size_t size() const { return used_; }
+
+    void add(void* block) {
+        if (used_ == room_) {
+            room_ = room_ == 0 ? 1024 : room_ * 2;
+            blocks_ = static_cast<void**>(std::realloc(blocks_, room_ * sizeof(void*)));
+            if (blocks_ == nullptr) {
+                std::abort();
+            }
+        }
+        blocks_[used_++] = block;
+    }
+
+    // What was made last is mostly freed first.
+    void remove(const void* block) {
+        for (std::size_t i = used_; i > 0; --i) {
+            if (blocks_[i - 1] == block) {
+                std::memmove(blocks_ + i - 1, blocks_ + i, (used_ - i) * sizeof(void*));
+                --used_;
+                return;
+            }
+        }
+    }
+
+private:
+    void** blocks_ = nullptr;
+    std::size_t used_ = 0;
+    std::size_t room_ = 0;
+};
+
 struct Plan {
     bool armed = false;
+    bool counting = false;
     bool looking = false; // while the caller is being found out, which may allocate
     std::size_t left = 0;
     bool hit = false;
     Range library;
     Range cxxLibrary;
+    Ledger blocks;
 };
 thread_local Plan plan;
 
@@ -89,8 +128,9 @@ bool standsBehind(const void* caller) {
     return false;
 }
 
+// Whether the allocation is the library's, as far as that is still of interest.
 bool counts(const void* caller) {
-    if (!plan.armed || plan.looking || plan.hit) {
+    if (!plan.armed || plan.looking || (plan.hit && !plan.counting)) {
         return false;
     }
     if (!plan.cxxLibrary.holds(caller)) {
@@ -103,7 +143,8 @@ bool counts(const void* caller) {
 }
 
 void* allocate(std::size_t size, const void* caller) {
-    if (counts(caller) && --plan.left == 0) {
+    const bool counted = counts(caller);
+    if (counted && !plan.hit && --plan.left == 0) {
         plan.hit = true;
         throw std::bad_alloc();
     }
@@ -111,7 +152,17 @@ void* allocate(std::size_t size, const void* caller) {
     if (memory == nullptr) {
         throw std::bad_alloc();
     }
+    if (counted && plan.counting) {
+        plan.blocks.add(memory);
+    }
     return memory;
+}
+
+void release(void* memory) {
+    if (plan.armed && plan.counting) {
+        plan.blocks.remove(memory);
+    }
+    std::free(memory);
 }
 
 } // namespace
@@ -122,6 +173,7 @@ void FailingAllocation::arm(const std::string& library, std::size_t n) {
     plan.library = rangeOf(library.c_str());
     plan.cxxLibrary = rangeAround(dlsym(RTLD_DEFAULT, "_ZNSaIcEC1Ev"));
     plan.left = n;
+    plan.blocks.clear();
     plan.hit = false;
     plan.armed = true;
 }
@@ -130,6 +182,10 @@ bool FailingAllocation::disarm() {
     plan.armed = false;
     return plan.hit;
 }
+
+void FailingAllocation::countBlocks(bool on) { plan.counting = on; }
+
+std::size_t FailingAllocation::blocksLeft() { return plan.blocks.size(); }
 
 } // namespace qelo::test
 
@@ -143,7 +199,7 @@ void* operator new[](std::size_t size) {
     return qelo::test::allocate(size, __builtin_return_address(0));
 }
 
-void operator delete(void* memory) noexcept { std::free(memory); }
-void operator delete[](void* memory) noexcept { std::free(memory); }
-void operator delete(void* memory, std::size_t) noexcept { std::free(memory); }
-void operator delete[](void* memory, std::size_t) noexcept { std::free(memory); }
+void operator delete(void* memory) noexcept { qelo::test::release(memory); }
+void operator delete[](void* memory) noexcept { qelo::test::release(memory); }
+void operator delete(void* memory, std::size_t) noexcept { qelo::test::release(memory); }
+void operator delete[](void* memory, std::size_t) noexcept { qelo::test::release(memory); }

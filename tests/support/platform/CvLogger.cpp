@@ -34,7 +34,7 @@ struct CvMessageBuffer::Text {
     std::ostringstream stream;
 };
 
-CvMessageBuffer::CvMessageBuffer() : text_(new Text) {}
+CvMessageBuffer::CvMessageBuffer() : text_((RecordingPort::buffer(), new Text)) {}
 CvMessageBuffer::~CvMessageBuffer() { delete text_; }
 
 CvMessageBuffer& CvMessageBuffer::operator<<(const char* text) {

@@ -45,6 +45,7 @@ void RecordingPlatform::reset() {
     state_->store = StoreModel{};
     state_->store.cursorsOpen = open;
     state_->faults = StoreFaultPlan{};
+    state_->libraryFaults = StoreFaultPlan{};
     state_->records = Records{};
     state_->support = Support{};
 }
@@ -55,6 +56,7 @@ void RecordingPlatform::forget() {
     state_->records = Records{};
     state_->records.on = on;
     state_->faults.restart();
+    state_->libraryFaults.restart();
 }
 
 void RecordingPlatform::setRecording(bool on) {
@@ -97,6 +99,14 @@ void RecordingPlatform::failStoreCall(std::size_t n, StoreFault fault) {
 void RecordingPlatform::failOperation(const std::string& operation, std::size_t n,
                                       StoreFault fault) {
     locked(*state_, [&] { state_->faults.byOperation[{operation, n}] = fault; });
+}
+
+void RecordingPlatform::failLibraryCall(std::size_t n, StoreFault fault) {
+    locked(*state_, [&] { state_->libraryFaults.byCall[n] = fault; });
+}
+
+std::size_t RecordingPlatform::libraryCallCount() const {
+    return locked(*state_, [&] { return state_->libraryFaults.calls; });
 }
 
 std::size_t RecordingPlatform::storeCallCount() const {

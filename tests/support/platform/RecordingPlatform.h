@@ -118,6 +118,10 @@ public:
     // count), or the n-th of one operation. Several faults may be set.
     void failStoreCall(std::size_t n, StoreFault fault);
     void failOperation(const std::string& operation, std::size_t n, StoreFault fault);
+    // The same for the calls of the other libraries: each text and answer asked for, each line,
+    // each message buffer. Answering false stands for an empty text, a refusal, or a lost line.
+    void failLibraryCall(std::size_t n, StoreFault fault);
+    std::size_t libraryCallCount() const;
     std::size_t storeCallCount() const;
     std::vector<StoreCall> storeCalls() const;
     // The texts of storeCalls() alone.

@@ -41,7 +41,10 @@ public:
     static std::string printablePath(CursorState& cursor, const std::string& path);
     static unsigned int size(CursorState& cursor);
 
+    // The other libraries, to each of which a fault may be set as well.
+    static void buffer(); // a message buffer is made
     static void line(LogLine line);
+    static std::string narrow(std::string text);
     static std::string systemName();
     // What the next comparison is to answer, if a test has said so.
     static std::optional<bool> scriptedComparison();

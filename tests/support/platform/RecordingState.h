@@ -24,6 +24,7 @@ struct StoreModel {
     std::size_t cursorsOpen = 0;
 };
 
+// Which calls of the store fail; a second plan holds those of all other libraries.
 struct StoreFaultPlan {
     std::map<std::size_t, StoreFault> byCall;
     std::map<std::pair<std::string, std::size_t>, StoreFault> byOperation;
@@ -70,7 +71,12 @@ struct RecordingPlatform::State {
     mutable std::mutex mutex;
     StoreModel store;
     StoreFaultPlan faults;
+    StoreFaultPlan libraryFaults;
     Records records;
+
+    // Counts a call of another library than the store; true when it is to answer with nothing.
+    // Throws when it is to throw.
+    bool refusesLibraryCall(const std::string& operation);
     Support support;
 };
 

@@ -7,6 +7,7 @@
 
 #include <cstring>
 #include <strings.h>
+#include <utility>
 
 using qelo::test::RecordingPort;
 
@@ -100,7 +101,7 @@ std::string make_string(const std::wstring& text) {
     for (const wchar_t character : text) {
         appendUtf8(narrow, static_cast<char32_t>(character));
     }
-    return narrow;
+    return RecordingPort::narrow(std::move(narrow));
 }
 
 } // namespace Tesk

@@ -10,7 +10,12 @@
 
 #include "Trace.h"
 
+#include <cstddef>
+#include <cstdint>
+#include <locale>
+#include <ostream>
 #include <string>
+#include <string_view>
 #include <type_traits>
 #include <utility>
 
@@ -18,8 +23,14 @@ namespace Tesk {
 
 // Where a trace point stands.
 struct TraceSite {
+    constexpr TraceSite(const char* inFunction, int atLine)
+        : function(inFunction), line(atLine), length(std::char_traits<char>::length(inFunction)) {}
+
     const char* function;
     int line;
+    std::size_t length; // of the function's name
+
+    std::string_view name() const { return {function, length}; }
 
     // As a default argument: the place of the call.
     static constexpr TraceSite here(const char* function = __builtin_FUNCTION(),
@@ -33,7 +44,7 @@ struct TraceSite {
 class UnitTrace {
 public:
     UnitTrace(const std::string& component, const char* file)
-        : component_(component), file_(file) {}
+        : component_(component), file_(file), fileName_(file) {}
 
     const std::string& component() const { return component_; }
     const char* file() const { return file_; }
@@ -62,15 +73,17 @@ public:
     // "MESSAGE ...: text", at failure level unless another is given.
     void message(const char* text, int level = TraceLevel::failure,
                  TraceSite site = TraceSite::here()) const {
-        emit(level, site, [&] { return trace(text, file_, site.line, MESSAGE); });
+        emit(level, site, [&] { return trace(traceText(text), fileName_, site.line, MESSAGE); });
     }
 
     // "VARIABLE: ..." with a number (printed signed) or a text.
     void variable(const char* name, unsigned int value, TraceSite site = TraceSite::here()) const {
-        emit(TraceLevel::detail, site, [&] { return trace(name, file_, site.line, value); });
+        emit(TraceLevel::detail, site,
+             [&] { return trace(traceText(name), fileName_, site.line, value); });
     }
     void variable(const char* name, const char* value, TraceSite site = TraceSite::here()) const {
-        emit(TraceLevel::detail, site, [&] { return trace(name, file_, site.line, value); });
+        emit(TraceLevel::detail, site,
+             [&] { return trace(traceText(name), fileName_, site.line, traceText(value)); });
     }
     void variable(const char* name, const std::string& value,
                   TraceSite site = TraceSite::here()) const {
@@ -84,8 +97,9 @@ public:
 
     // A line with a parameter list.
     void withParameters(const std::string& params, MessageType type, TraceSite site) const {
-        emit(TraceLevel::progress, site,
-             [&] { return tracepara(site.function, file_, site.line, params.c_str(), type); });
+        emit(TraceLevel::progress, site, [&] {
+            return tracepara(site.name(), fileName_, site.line, traceText(params.c_str()), type);
+        });
     }
 
     // A getter: traces that it was invoked and the field's value, and returns a copy of it.
@@ -104,7 +118,7 @@ public:
 
 private:
     void line(int level, TraceSite site, MessageType type) const {
-        emit(level, site, [&] { return trace(site.function, file_, site.line, type); });
+        emit(level, site, [&] { return trace(site.name(), fileName_, site.line, type); });
     }
 
     template <class Format> void emit(int level, const TraceSite& site, Format format) const {
@@ -113,6 +127,7 @@ private:
 
     const std::string& component_;
     const char* file_;
+    std::string_view fileName_;
 };
 
 // Adds a value to a parameter list: texts, numbers and flags as they are, anything else
@@ -126,9 +141,26 @@ inline void insertParameter(CvLog::CvMessageBuffer& list, unsigned short value) 
     list << static_cast<unsigned int>(value);
 }
 inline void insertParameter(CvLog::CvMessageBuffer& list, bool value) { list << value; }
+// What a stream writes for an address. Where the process has changed no locale, by hand: the
+// making of a stream costs more than all the rest of a line.
+inline void insertAddress(CvLog::CvMessageBuffer& list, const void* address) {
+    if (address == nullptr || !(std::locale() == std::locale::classic())) {
+        static_cast<std::ostream&>(list) << address;
+        return;
+    }
+    char digits[sizeof "0x" + 2 * sizeof address];
+    char* first = digits + sizeof digits - 1;
+    *first = '\0';
+    for (auto rest = reinterpret_cast<std::uintptr_t>(address); rest != 0; rest /= 16) {
+        *--first = "0123456789abcdef"[rest % 16];
+    }
+    *--first = 'x';
+    *--first = '0';
+    list << first;
+}
 template <class Pointee>
 void insertParameter(CvLog::CvMessageBuffer& list, const Pointee* address) {
-    static_cast<std::ostream&>(list) << static_cast<const void*>(address);
+    insertAddress(list, static_cast<const void*>(address));
 }
 
 inline void insertParameters(CvLog::CvMessageBuffer&) {}

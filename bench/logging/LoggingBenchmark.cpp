@@ -2,6 +2,7 @@
 //
 // Makes its own configuration and log file in a scratch directory. The log admits 6000 and
 // above, as it does by default; the trace has ten components of its own and admits nothing.
+#include "UnitTrace.h"
 #include "platform/CvLogger.h"
 
 #include <benchmark/benchmark.h>
@@ -74,18 +75,23 @@ void bufferWithAPointerThroughItsStream(benchmark::State& state) {
 }
 BENCHMARK(bufferWithAPointerThroughItsStream);
 
-// The whole of a trace point: the text twice, to the log and to the trace.
+// The whole of a trace point as the provider has it: the text, to the log and to the trace.
+const Tesk::UnitTrace unit(component, "LoggingBenchmark");
+
 void tracePointNotAdmitted(benchmark::State& state) {
     for ([[maybe_unused]] auto _ : state) {
-        CvLog::CvMessageBuffer log;
-        CvLog::CvLogger::logLevelMessage("bench", "LoggingBenchmark", 1, component, kProgress,
-                                         nullptr, 0, 0, log.str(log << message));
-        CvLog::CvMessageBuffer trace;
-        CvLog::CvLogger::traceLevelMessage("bench", "LoggingBenchmark", 1, component, kProgress,
-                                           nullptr, 0, 0, trace.str(trace << message));
+        unit.method();
     }
 }
 BENCHMARK(tracePointNotAdmitted);
+
+void tracePointOfAVariableNotAdmitted(benchmark::State& state) {
+    const std::string value = "/home/user100000";
+    for ([[maybe_unused]] auto _ : state) {
+        unit.variable("_homeDirectory", value);
+    }
+}
+BENCHMARK(tracePointOfAVariableNotAdmitted);
 
 class Scratch {
 public:

@@ -11,6 +11,23 @@
 
 namespace qelo::logging {
 
+// Whether two texts of the same size are equal. In place, and by 16 characters at once: for
+// names this short a call of memcmp() costs more than the comparison.
+inline bool sameCharacters(const char* left, const char* right, std::size_t size) {
+    constexpr std::size_t step = 16;
+    if (size < step) {
+        return std::memcmp(left, right, size) == 0;
+    }
+    std::size_t at = 0;
+    for (; at + step < size; at += step) {
+        if (std::memcmp(left + at, right + at, step) != 0) {
+            return false;
+        }
+    }
+    at = size - step; // the last part may overlap the one before
+    return std::memcmp(left + at, right + at, step) == 0;
+}
+
 // For one thread only. An aggregate of plain values: a thread_local one needs no construction
 // and no destruction, so it serves before main and while its thread ends.
 struct AdmissionCache {
@@ -28,7 +45,7 @@ struct AdmissionCache {
 
         bool holds(const std::string& component, std::uint32_t current) const {
             return generation == current && size == component.size() &&
-                   std::memcmp(name.data(), component.data(), component.size()) == 0;
+                   sameCharacters(name.data(), component.data(), component.size());
         }
     };
 
@@ -44,6 +61,16 @@ struct AdmissionCache {
         const std::uint64_t first =
             (static_cast<std::uint64_t>(address) * 0x9E3779B97F4A7C15U) >> (64 - kSlotBits);
         return {slots[first & ~std::uint64_t{1}], slots[first | 1]};
+    }
+
+    // Whether a line is turned away whatever its component. False says nothing: isAdmitted()
+    // has to be asked. Never throws, and leaves errno alone.
+    bool turnsAway(const LoggerCore& core, Channel channel, int level) {
+        if (linesToCheck == 0 || level >= core.lowestThreshold(channel)) {
+            return false;
+        }
+        --linesToCheck;
+        return true;
     }
 
     std::uint32_t linesToCheck;

@@ -12,6 +12,7 @@
 
 namespace CvLog {
 
+using qelo::logging::appendTo;
 using qelo::logging::TextBuffer;
 using qelo::logging::TextStream;
 using qelo::logging::toString;
@@ -22,9 +23,7 @@ struct __attribute__((visibility("hidden"))) CvMessageBuffer::Text {
     std::unique_ptr<TextStream> stream; // made when first asked for
     Text* next = nullptr;               // in the list of unused texts
 
-    void append(std::string_view text) {
-        characters.append(text.data(), text.data() + text.size());
-    }
+    void append(std::string_view text) { appendTo(characters, text.data(), text.size()); }
 
     // A trace point makes and drops one or two buffers, and there are some in every function:
     // each thread keeps a few texts, with their memory, for its next buffers.
@@ -52,6 +51,8 @@ private:
 
     static void keepOrDelete(Text* text) noexcept;
 
+    // Not of the initial-exec model: object managers load this library late, when there is no
+    // static thread storage left for it.
     static thread_local List list;
     static thread_local Reaper reaper;
 };
@@ -123,7 +124,7 @@ CvMessageBuffer& CvMessageBuffer::operator<<(const std::string& text) {
 CvMessageBuffer& CvMessageBuffer::operator<<(unsigned int number) {
     std::array<char, std::numeric_limits<unsigned int>::digits10 + 1> digits{};
     const auto result = std::to_chars(digits.data(), digits.data() + digits.size(), number);
-    text_->characters.append(digits.data(), result.ptr);
+    text_->append({digits.data(), static_cast<std::size_t>(result.ptr - digits.data())});
     return *this;
 }
 

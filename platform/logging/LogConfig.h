@@ -55,6 +55,9 @@ public:
 
     Threshold of(std::string_view component) const;
 
+    // The lowest that any component has.
+    Threshold lowest() const;
+
 private:
     Threshold root_;
     std::map<std::string, Threshold, std::less<>> components_;
@@ -71,6 +74,7 @@ struct ChannelConfig {
 
     // The threshold that counts: nothing is admitted to a channel that goes nowhere.
     Threshold thresholdOf(std::string_view component) const;
+    Threshold lowestThreshold() const;
 };
 
 struct Problem {

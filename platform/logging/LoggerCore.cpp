@@ -74,6 +74,10 @@ std::shared_ptr<const LoggerCore::State> LoggerCore::state() const {
 void LoggerCore::publish(std::shared_ptr<const State> state) {
     const std::lock_guard lock(stateMutex_);
     state_.swap(state);
+    for (const Channel channel : {Channel::Log, Channel::Trace}) {
+        lowest_[static_cast<std::size_t>(channel)].store(
+            state_->config.of(channel).lowestThreshold(), std::memory_order_relaxed);
+    }
     std::uint32_t next = generation_.load(std::memory_order_relaxed) + 1;
     generation_.store(next == 0 ? 1 : next, std::memory_order_release);
 }

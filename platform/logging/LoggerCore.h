@@ -29,6 +29,11 @@ public:
     // Counts the configurations read; thresholds hold as long as it stands still. Never 0.
     std::uint32_t generation() const { return generation_.load(std::memory_order_acquire); }
 
+    // No line below this level is admitted, whatever its component. Takes no lock.
+    Threshold lowestThreshold(Channel channel) const {
+        return lowest_[static_cast<std::size_t>(channel)].load(std::memory_order_relaxed);
+    }
+
     struct Admission {
         std::uint32_t generation;
         std::array<Threshold, kChannels> thresholds;
@@ -62,6 +67,7 @@ private:
     const Clock::duration checkInterval_;
     std::atomic<Clock::rep> nextCheck_{0};
     std::atomic<std::uint32_t> generation_{0};
+    std::array<std::atomic<Threshold>, kChannels> lowest_{};
 
     mutable std::mutex stateMutex_;
     std::shared_ptr<const State> state_; // guarded by stateMutex_

@@ -3,6 +3,8 @@
 
 #include <fmt/format.h>
 
+#include <cstddef>
+#include <cstring>
 #include <ostream>
 #include <streambuf>
 #include <string>
@@ -11,6 +13,13 @@ namespace qelo::logging {
 
 // Holds what most lines need without an allocation; appending is cheaper than to a string.
 using TextBuffer = fmt::basic_memory_buffer<char, 512>;
+
+// As the buffer's own append(), which is a call of some length for a few characters.
+inline void appendTo(TextBuffer& text, const char* characters, std::size_t count) {
+    const std::size_t before = text.size();
+    text.resize(before + count);
+    std::memcpy(text.data() + before, characters, count);
+}
 
 inline std::string toString(const TextBuffer& text) { return {text.data(), text.size()}; }
 
@@ -29,7 +38,7 @@ protected:
     }
 
     std::streamsize xsputn(const char* characters, std::streamsize count) override {
-        text_.append(characters, characters + count);
+        appendTo(text_, characters, static_cast<std::size_t>(count));
         return count;
     }
 

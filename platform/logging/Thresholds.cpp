@@ -1,5 +1,7 @@
 #include "logging/LogConfig.h"
 
+#include <algorithm>
+
 namespace qelo::logging {
 namespace {
 
@@ -42,8 +44,20 @@ Threshold Thresholds::of(std::string_view component) const {
     return root_;
 }
 
+Threshold Thresholds::lowest() const {
+    Threshold lowest = root_;
+    for (const auto& [component, threshold] : components_) {
+        lowest = std::min(lowest, threshold);
+    }
+    return lowest;
+}
+
 Threshold ChannelConfig::thresholdOf(std::string_view component) const {
     return target.kind == SinkKind::None ? kAdmitsNothing : thresholds.of(component);
+}
+
+Threshold ChannelConfig::lowestThreshold() const {
+    return target.kind == SinkKind::None ? kAdmitsNothing : thresholds.lowest();
 }
 
 } // namespace qelo::logging

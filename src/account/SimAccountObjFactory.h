@@ -6,6 +6,10 @@
 
 #include "../frame/ObjFactory.h"
 
+#include <memory>
+
+struct UConverter; // of ICU
+
 namespace Tesk {
 namespace SimpleIdentityManagementProvider {
 
@@ -32,6 +36,15 @@ public:
     // The first 14 digits of a time text as the text of a CIM datetime in UTC; empty when
     // there are fewer.
     std::string adjustString(std::string value);
+
+private:
+    // A converter from UTF-8, made when first needed; null while it cannot be made.
+    struct CloseConverter {
+        void operator()(UConverter* converter) const;
+    };
+    UConverter* converter();
+
+    std::unique_ptr<UConverter, CloseConverter> converter_;
 };
 
 // Asks the node store to re-read users and groups when its count of accounts differs from

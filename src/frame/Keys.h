@@ -6,9 +6,10 @@
 
 #include <platform/TeskCommon.h>
 
+#include <algorithm>
+#include <array>
 #include <cstddef>
 #include <string>
-#include <vector>
 
 namespace Tesk {
 namespace SimpleIdentityManagementProvider {
@@ -34,7 +35,9 @@ template <auto getter, class Record> std::string text(Record& record) { return (
 template <class Record> class KeyTable {
 public:
     template <std::size_t count>
-    constexpr KeyTable(const KeyRow<Record> (&rows)[count]) : rows_(rows), count_(count) {}
+    constexpr KeyTable(const KeyRow<Record> (&rows)[count]) : rows_(rows), count_(count) {
+        static_assert(count <= most, "more keys than any class has");
+    }
 
     const KeyRow<Record>* begin() const { return rows_; }
     const KeyRow<Record>* end() const { return rows_ + count_; }
@@ -49,12 +52,9 @@ public:
     // Hands the requested list and the names of the keys to the broker's own filter, then sets
     // the keys of a record.
     void setIn(CMPIInstance* instance, const char** properties, Record& record) const {
-        std::vector<const char*> names;
-        names.reserve(count_ + 1);
-        for (const KeyRow<Record>& row : *this) {
-            names.push_back(row.name);
-        }
-        names.push_back(nullptr);
+        std::array<const char*, most + 1> names{}; // ends with null
+        std::transform(begin(), end(), names.begin(),
+                       [](const KeyRow<Record>& row) { return row.name; });
         CMSetPropertyFilter(instance, properties, names.data());
         for (const KeyRow<Record>& row : *this) {
             const std::string text = row.text(record);
@@ -63,6 +63,8 @@ public:
     }
 
 private:
+    static constexpr std::size_t most = 8;
+
     const KeyRow<Record>* rows_;
     std::size_t count_;
 };

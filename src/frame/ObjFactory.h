@@ -11,6 +11,7 @@
 #include <cstdint>
 #include <map>
 #include <string>
+#include <utility>
 #include <vector>
 
 namespace Tesk {
@@ -131,17 +132,20 @@ private:
     static const UnitTrace& lines() { return shape().unit; }
     static TraceSite at(const char* name, int line = __builtin_LINE()) { return {name, line}; }
 
+    // The map takes over what the records hold; nothing reads them there any more. Stores often
+    // have their records in the order of the keys, so each is first tried at the end.
     void createMap() {
         lines().entering(at(Derived::names.createMap));
         if (shape().sameKey == SameKey::Replaces) {
             for (Record& record : records_) {
-                map_[(record.*shape().key)()] = record;
+                const auto entry = map_.try_emplace(map_.end(), (record.*shape().key)());
+                entry->second = std::move(record);
             }
         } else {
             const auto count = static_cast<std::uint16_t>(records_.size());
             for (std::uint16_t i = 0; i < count; ++i) {
                 Record& record = records_.at(i);
-                map_.emplace((record.*shape().key)(), record);
+                map_.emplace_hint(map_.end(), (record.*shape().key)(), std::move(record));
             }
         }
         lines().exiting(at(Derived::names.createMap));
@@ -176,7 +180,7 @@ private:
         }
     }
 
-    std::vector<Record> records_;       // in store order
+    std::vector<Record> records_;       // in store order, until they are in the map
     std::map<std::string, Record> map_; // by key
 };
 

@@ -1,11 +1,18 @@
 // The texts of the trace formatters, byte for byte.
-#include <Trace.h>
+#include "support/platform/RecordingPlatform.h"
+
+#include <UnitTrace.h>
 
 #include <gtest/gtest.h>
 
 #include <climits>
+#include <cstdint>
 #include <cstring>
+#include <locale>
+#include <map>
+#include <sstream>
 #include <string>
+#include <thread>
 #include <vector>
 
 namespace qelo::test {
@@ -129,6 +136,88 @@ TEST(TraceFormat, Each_formatter_has_one_buffer_of_its_own) {
     EXPECT_EQ(std::vector<bool>({plain != params, plain != number, plain != text, params != number,
                                  params != text, number != text}),
               std::vector<bool>(6, true));
+}
+
+TEST(TraceFormat, A_missing_text_is_an_empty_one) {
+    const char* none = nullptr;
+    EXPECT_STREQ(Tesk::trace(none, "Unit", 7, Tesk::MESSAGE), "MESSAGE [File: Unit, Line: 7]: ");
+    EXPECT_STREQ(Tesk::trace("name", none, 7, none), "VARIABLE: 'name' has Value '' at line 7 in ");
+}
+
+std::string streamed(const void* address) {
+    std::ostringstream text;
+    text << address;
+    return text.str();
+}
+
+TEST(ParameterList, Addresses_look_as_a_stream_writes_them) {
+    const int here = 0;
+    for (const void* address :
+         {static_cast<const void*>(&here), static_cast<const void*>(nullptr),
+          reinterpret_cast<const void*>(std::uintptr_t{1}),
+          reinterpret_cast<const void*>(std::uintptr_t{0x1000}),
+          reinterpret_cast<const void*>(std::uintptr_t{0xfedcba9876543210})}) {
+        EXPECT_EQ(Tesk::parameters(" at=", address, " end=", true),
+                  " at=" + streamed(address) + " end=1");
+    }
+}
+
+// Writes numbers in groups of three, as many languages do.
+struct Grouped : std::numpunct<char> {
+    char do_thousands_sep() const override { return '.'; }
+    std::string do_grouping() const override { return "\3"; }
+};
+
+TEST(ParameterList, Addresses_look_as_a_stream_writes_them_in_another_locale) {
+    const std::locale before =
+        std::locale::global(std::locale(std::locale::classic(), new Grouped));
+    const auto* address = reinterpret_cast<const void*>(std::uintptr_t{0x12345678});
+    const std::string list = Tesk::parameters(" at=", address);
+    const std::string expected = " at=" + streamed(address);
+    std::locale::global(before);
+    EXPECT_EQ(list, expected);
+}
+
+// A line that is raised while another is being made, as by a value that traces how it is read.
+TEST(EmitLine, Lines_within_lines_keep_their_texts) {
+    auto& platform = RecordingPlatform::instance();
+    platform.reset();
+    const std::string component = "Corvane.Test";
+    const auto text = [](const char* message) { return [=] { return message; }; };
+    const Tesk::LineText outer("outer");
+    Tesk::emitLine("f", "U", 1, component, 3000, text("inner"));
+    const std::string& held = outer;
+    EXPECT_EQ(held, "outer");
+    const auto lines = platform.lines();
+    ASSERT_EQ(lines.size(), 2U);
+    EXPECT_EQ(lines[0].message, "inner");
+    EXPECT_EQ(lines[1].message, "inner");
+}
+
+TEST(EmitLine, Lines_of_many_threads_are_all_there) {
+    auto& platform = RecordingPlatform::instance();
+    platform.reset();
+    constexpr int threadCount = 4;
+    constexpr int linesEach = 200;
+    std::vector<std::thread> threads;
+    for (int i = 0; i < threadCount; ++i) {
+        threads.emplace_back([text = std::string(40, static_cast<char>('a' + i))] {
+            for (int line = 0; line < linesEach; ++line) {
+                Tesk::emitLine("f", "U", line, "Corvane.Test", 3000, [&] { return text.c_str(); });
+            }
+        });
+    }
+    for (std::thread& thread : threads) {
+        thread.join();
+    }
+    std::map<std::string, int> counts;
+    for (const LogLine& line : platform.lines()) {
+        ++counts[line.message];
+    }
+    EXPECT_EQ(counts.size(), static_cast<std::size_t>(threadCount));
+    for (const auto& [text, count] : counts) {
+        EXPECT_EQ(count, 2 * linesEach) << text;
+    }
 }
 
 } // namespace

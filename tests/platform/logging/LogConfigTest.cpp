@@ -69,6 +69,17 @@ TEST(LogConfig, Log_and_trace_have_thresholds_of_their_own) {
     EXPECT_EQ(logThreshold(config, "x"), kAdmitsNothing);
 }
 
+TEST(LogConfig, The_lowest_threshold_is_that_of_the_root_or_of_a_component) {
+    const auto lowest = [](const char* text) {
+        return parseConfig(text).of(Channel::Log).lowestThreshold();
+    };
+    EXPECT_EQ(lowest(""), kFailureLevel);
+    EXPECT_EQ(lowest("log.level = 3000"), 3000);
+    EXPECT_EQ(lowest("log.level.a.b = 4000\nlog.level.c = off"), 4000);
+    EXPECT_EQ(lowest("log.level = off\nlog.level.a = 7000"), 7000);
+    EXPECT_EQ(lowest("log = none\nlog.level.a = 0"), kAdmitsNothing);
+}
+
 TEST(LogConfig, A_channel_that_goes_nowhere_admits_nothing_whatever_its_level) {
     EXPECT_EQ(traceThreshold(parseConfig("trace.level = 0"), "x"), kAdmitsNothing);
     EXPECT_EQ(logThreshold(parseConfig("log = none\nlog.level.x = 0"), "x"), kAdmitsNothing);

@@ -5,17 +5,29 @@
 #include <algorithm>
 #include <memory>
 
+#include <sys/mman.h>
+
 namespace qelo::broker {
 namespace {
 
 constexpr std::size_t alignment = alignof(std::max_align_t);
-constexpr std::size_t largestGrowth = 256 * 1024;
+constexpr std::size_t largestGrowth = 4UL * 1024 * 1024;
 
 std::size_t roundUp(std::size_t size) {
     if (size > SIZE_MAX - alignment) {
         throw std::bad_alloc();
     }
     return (size + alignment - 1) / alignment * alignment;
+}
+
+// Large blocks are filled from front to back, so that they are cheaper by large pages than by a
+// fault for each small one. Only asked for: what the system makes of it does not matter.
+void preferLargePages(void* memory, std::size_t size) {
+    constexpr std::size_t largePage = 2UL * 1024 * 1024;
+    void* first = memory;
+    if (std::align(largePage, largePage, first, size) != nullptr) {
+        (void)::madvise(first, size / largePage * largePage, MADV_HUGEPAGE);
+    }
 }
 
 } // namespace
@@ -49,6 +61,7 @@ void Arena::addBlock(std::size_t size) {
         throw std::bad_alloc();
     }
     void* memory = ::operator new(sizeof(Block) + room);
+    preferLargePages(memory, sizeof(Block) + room);
     blocks_ = new (memory) Block{blocks_};
     free_ = static_cast<std::byte*>(memory) + sizeof(Block);
     end_ = free_ + room;

@@ -90,14 +90,19 @@ CMPIDateTime* makeDateTimeFromBinary(const CMPIBroker* mb, CMPIUint64 microsecon
 }
 
 CMPIDateTime* makeDateTimeFromChars(const CMPIBroker* mb, const char* text, CMPIStatus* st) {
-    return slot<CMPIDateTime*>(st, nullptr, [&] {
+    bool refused = false;
+    CMPIDateTime* made = slot<CMPIDateTime*>(st, nullptr, [&]() -> CMPIDateTime* {
         (void)aliveBroker(mb);
         const auto time = text ? cim::DateTime::parse(text) : std::nullopt;
-        if (!time) {
-            throw Refusal{CMPI_RC_ERR_INVALID_PARAMETER};
-        }
-        return dateTime(*time);
+        refused = !time;
+        return refused ? nullptr : dateTime(*time);
     });
+    // Not thrown as other refusals are: providers ask for the date of a text without knowing
+    // whether there is one in it, and often there is none.
+    if (refused && st) {
+        *st = {CMPI_RC_ERR_INVALID_PARAMETER, nullptr};
+    }
+    return made;
 }
 
 // Queries are left to the providers; nothing here parses them.

@@ -11,15 +11,41 @@
 
 namespace qelo::server {
 
+// A function that a test may exchange while the server calls it.
+class Hook {
+public:
+    using Function = std::function<void(std::size_t index)>;
+
+    Hook& operator=(Function function) {
+        const std::lock_guard<std::mutex> lock(mutex_);
+        function_ = std::move(function);
+        return *this;
+    }
+    void operator()(std::size_t index) const {
+        Function function;
+        {
+            const std::lock_guard<std::mutex> lock(mutex_);
+            function = function_;
+        }
+        if (function) {
+            function(index);
+        }
+    }
+
+private:
+    mutable std::mutex mutex_;
+    Function function_;
+};
+
 class FakeRouter final : public broker::Router {
 public:
     using Context = broker::OperationContext;
 
     // What there is: instances of TEST_Thing with the keys "0", "1" ...
-    std::size_t count = 3;
+    std::atomic<std::size_t> count{3};
     std::size_t textSize = 10; // of each one's property Text
     // Called before each result; may throw or wait.
-    std::function<void(std::size_t index)> beforeResult;
+    Hook beforeResult;
 
     // What was asked, one line each.
     std::vector<std::string> asked() const {
@@ -140,22 +166,16 @@ private:
     }
     void paths(const client::PathSink& sink) const {
         for (std::size_t i = 0; i < count; ++i) {
-            before(i);
+            beforeResult(i);
             sink(path(i));
         }
     }
     void instances(const client::InstanceSink& sink) const {
         for (std::size_t i = 0; i < count; ++i) {
-            before(i);
+            beforeResult(i);
             sink(instance(i));
         }
     }
-    void before(std::size_t index) const {
-        if (beforeResult) {
-            beforeResult(index);
-        }
-    }
-
     mutable std::mutex mutex_;
     std::vector<std::string> asked_;
 };

@@ -19,6 +19,7 @@ void letTheLoggerLook() {
         CvLog::CvLogger::traceLevelMessage("letTheLoggerLook", "Logging", 1, "Bench", 1, nullptr, 0,
                                            0, "line");
     }
+    std::this_thread::sleep_for(std::chrono::milliseconds(100)); // gathered lines get written
 }
 
 } // namespace

@@ -13,6 +13,10 @@ namespace qelo::logging {
 namespace {
 
 constexpr std::chrono::seconds kCheckInterval{1};
+
+// What is gathered at most before it is written, but for the last line.
+constexpr std::size_t kMostHeld = std::size_t{32} * 1024;
+
 constexpr mode_t kOwnerOnly = S_IRUSR | S_IWUSR;
 
 [[noreturn]] void fail(int error) { throw std::system_error(error, std::generic_category()); }
@@ -31,19 +35,49 @@ int refusalOf(int fd) {
 
 } // namespace
 
-FileSink::FileSink(std::string path) : base_sink(makeLineFormatter()), path_(std::move(path)) {}
+FileSink::FileSink(std::string path, bool buffered)
+    : base_sink(makeLineFormatter()), path_(std::move(path)), buffered_(buffered) {
+    if (buffered_) {
+        HeldLines::instance().add(*this);
+    }
+}
+
+FileSink::~FileSink() {
+    if (buffered_) {
+        HeldLines::instance().remove(*this);
+        writeHeld();
+    }
+}
 
 void FileSink::sink_it_(const spdlog::details::log_msg& message) {
     reopenIfDue();
     if (!file_.isOpen()) {
         fail(openError_);
     }
-    spdlog::memory_buf_t line;
-    if (torn_) {
-        line.push_back('\n');
+    gather(message);
+    const bool mayWait = buffered_ && message.level < spdlog::level::err &&
+                         held_.size() < kMostHeld && heldError_ == 0;
+    if (!mayWait || !HeldLines::instance().request()) {
+        flush_();
     }
-    formatter_->format(message, line);
-    write(line.data(), line.size());
+}
+
+void FileSink::gather(const spdlog::details::log_msg& message) {
+    const std::size_t before = held_.size();
+    try {
+        formatter_->format(message, held_);
+    } catch (...) {
+        held_.resize(before);
+        throw;
+    }
+}
+
+void FileSink::flush_() {
+    write();
+    const int error = std::exchange(heldError_, 0);
+    if (error != 0) {
+        fail(error);
+    }
 }
 
 void FileSink::open() {
@@ -66,6 +100,7 @@ void FileSink::reopenIfDue() {
     }
     nextCheck_ = now + kCheckInterval;
     if (file_.isOpen() && !isStillAtPath()) {
+        writeHeld();
         file_.reset();
     }
     if (!file_.isOpen()) {
@@ -80,17 +115,37 @@ bool FileSink::isStillAtPath() const {
            opened.st_dev == named.st_dev && opened.st_ino == named.st_ino;
 }
 
-void FileSink::write(const char* bytes, std::size_t size) {
-    ssize_t written = -1;
-    do {
-        written = ::write(file_.get(), bytes, size);
-    } while (written < 0 && errno == EINTR);
-    if (written < 0) {
-        fail(errno);
-    }
-    torn_ = static_cast<std::size_t>(written) < size;
+void FileSink::write() {
     if (torn_) {
-        fail(ENOSPC);
+        torn_ = writeSome("\n", 1) == 0;
+    }
+    const std::size_t written = torn_ ? 0 : writeSome(held_.data(), held_.size());
+    torn_ = torn_ || (written > 0 && held_[written - 1] != '\n');
+    held_.clear();
+}
+
+// How much of it was written; less than all of it sets heldError_.
+std::size_t FileSink::writeSome(const char* bytes, std::size_t size) {
+    std::size_t done = 0;
+    while (done < size) {
+        const ssize_t count = ::write(file_.get(), bytes + done, size - done);
+        if (count > 0) {
+            done += static_cast<std::size_t>(count);
+        } else if (count == 0 || errno != EINTR) {
+            heldError_ = count == 0 ? ENOSPC : errno;
+            break;
+        }
+    }
+    return done;
+}
+
+void FileSink::lockLines() { mutex_.lock(); }
+
+void FileSink::unlockLines() { mutex_.unlock(); }
+
+void FileSink::writeHeld() noexcept {
+    if (held_.size() > 0) {
+        write();
     }
 }
 

@@ -1,12 +1,11 @@
 #include "logging/LineFormat.h"
 
 #include "common/Utf8.h"
+#include "logging/ProcessIds.h"
 
 #include <fmt/format.h>
 
 #include <iterator>
-
-#include <unistd.h>
 
 namespace qelo::logging {
 namespace {
@@ -106,13 +105,15 @@ void appendEscaped(std::string& out, std::string_view text, std::size_t limit, B
 std::string formatLine(const Line& line) {
     std::string text;
     text.reserve(line.message.size() + 160);
-    fmt::format_to(std::back_inserter(text), "[{}:{}] {} ", ::getpid(), ::gettid(), line.level);
+    const ProcessIds ids = processIds();
+    fmt::format_to(std::back_inserter(text), FMT_STRING("[{}:{}] {} "), ids.process, ids.thread,
+                   line.level);
     appendName(text, line.component);
     text += ' ';
     appendName(text, viewOf(line.function));
     text += "() ";
     appendName(text, viewOf(line.file));
-    fmt::format_to(std::back_inserter(text), ":{} ", line.number);
+    fmt::format_to(std::back_inserter(text), FMT_STRING(":{} "), line.number);
     appendEscaped(text, line.message, kLongestMessage, Blanks::Kept);
     return text;
 }

@@ -112,6 +112,7 @@ public:
             readLine(text.substr(0, end));
             text.remove_prefix(std::min(end + 1, text.size()));
         }
+        joinFiles();
         if (unreported_ > 0) {
             config_.problems.push_back({0, std::to_string(unreported_) + " more problems"});
         }
@@ -142,6 +143,10 @@ private:
             setTarget(channelKey->channel, value);
             return;
         }
+        if (channelKey && channelKey->rest == ".buffer") {
+            setBuffered(channelKey->channel, value);
+            return;
+        }
         const auto component = channelKey ? componentFrom(channelKey->rest) : std::nullopt;
         if (!component) {
             report("unknown setting " + quoted(key));
@@ -156,7 +161,16 @@ private:
             report("not a place to write to: " + quoted(value));
             return;
         }
+        target->buffered = config_.of(channel).target.buffered;
         config_.of(channel).target = std::move(*target);
+    }
+
+    void setBuffered(Channel channel, std::string_view value) {
+        if (value != "on" && value != "off") {
+            report("neither on nor off: " + quoted(value));
+            return;
+        }
+        config_.of(channel).target.buffered = value == "on";
     }
 
     void setThreshold(Channel channel, std::string_view component, std::string_view value) {
@@ -165,6 +179,15 @@ private:
             report("not a level: " + quoted(value));
         } else if (!config_.of(channel).thresholds.set(component, *threshold)) {
             report("too many components");
+        }
+    }
+
+    // Both channels into one file: one buffer, so that their lines keep their order.
+    void joinFiles() {
+        SinkTarget& log = config_.of(Channel::Log).target;
+        SinkTarget& trace = config_.of(Channel::Trace).target;
+        if (log.kind == SinkKind::File && trace.kind == SinkKind::File && log.path == trace.path) {
+            log.buffered = trace.buffered = log.buffered && trace.buffered;
         }
     }
 

@@ -4,6 +4,7 @@
 //
 //   log = syslog                          where the log goes: syslog, stderr, none
 //   trace = file:/var/log/qelosim.trace   or a file, given by its absolute path
+//   trace.buffer = off                    lines of a file are not gathered, but written at once
 //   log.level = 6000                      lowest level admitted, of every component
 //   log.level.Corvane.SimAccountObj = 3000    ... of this one and of those below it
 //   trace.level = off                     admits nothing
@@ -36,11 +37,12 @@ enum class SinkKind { None, Syslog, Stderr, File };
 
 struct SinkTarget {
     SinkKind kind = SinkKind::None;
-    std::string path; // of a file
+    std::string path;     // of a file
+    bool buffered = true; // whether lines of a file are gathered for a moment
 };
 
 inline bool operator==(const SinkTarget& left, const SinkTarget& right) {
-    return left.kind == right.kind && left.path == right.path;
+    return left.kind == right.kind && left.path == right.path && left.buffered == right.buffered;
 }
 
 // Thresholds per component. A component without one of its own has that of the component

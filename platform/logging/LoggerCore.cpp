@@ -125,10 +125,10 @@ std::shared_ptr<const LoggerCore::State> LoggerCore::makeState(const ConfigText&
     if (!file.refusal.empty()) {
         next->config.problems.push_back({0, "not read: " + file.refusal});
     }
-    for (const Channel channel : {Channel::Log, Channel::Trace}) {
-        next->outputs[static_cast<std::size_t>(channel)] =
-            outputFor(next->config.of(channel).target, channel);
-    }
+    auto& [log, trace] = next->outputs;
+    const SinkTarget& traceTarget = next->config.of(Channel::Trace).target;
+    log = outputFor(next->config.of(Channel::Log).target, Channel::Log);
+    trace = log->target() == traceTarget ? log : outputFor(traceTarget, Channel::Trace);
     return next;
 }
 

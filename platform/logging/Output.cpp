@@ -25,7 +25,7 @@ std::unique_ptr<spdlog::sinks::sink> makeSink(const SinkTarget& target) {
     case SinkKind::Stderr:
         return makeStderrSink();
     case SinkKind::File:
-        return std::make_unique<FileSink>(target.path);
+        return std::make_unique<FileSink>(target.path, target.buffered);
     case SinkKind::None:
         break;
     }

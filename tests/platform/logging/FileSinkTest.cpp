@@ -5,7 +5,10 @@
 #include <gmock/gmock.h>
 
 #include <csignal>
+#include <optional>
+#include <string>
 #include <thread>
+#include <vector>
 
 #include <fcntl.h>
 #include <sys/resource.h>
@@ -17,13 +20,49 @@ namespace {
 
 using namespace qelo::logging;
 using namespace qelo::test;
+using testing::AllOf;
+using testing::Each;
+using testing::ElementsAre;
 using testing::EndsWith;
 using testing::MatchesRegex;
 using testing::SizeIs;
 
 constexpr auto kLongerThanTheCheckInterval = std::chrono::milliseconds(1100);
 
+// Levels of lines that wait to be written, and of those that do not.
+constexpr int kProgress = 3000;
+constexpr int kFailure = 6000;
+
 SinkTarget fileAt(const std::string& path) { return {SinkKind::File, path}; }
+
+SinkTarget unbufferedFileAt(const std::string& path) { return {SinkKind::File, path, false}; }
+
+// The texts behind the times of a file's lines.
+std::vector<std::string> textsOf(const std::string& path) {
+    std::vector<std::string> texts;
+    for (const std::string& line : linesOf(path)) {
+        texts.push_back(line.substr(std::min(line.size(), line.find(' ') + 1)));
+    }
+    return texts;
+}
+
+// Waits for a file to have so many lines; false after ten seconds.
+bool awaitLines(const std::string& path, std::size_t count) {
+    for (int i = 0; i < 1000 && linesOf(path).size() < count; ++i) {
+        std::this_thread::sleep_for(std::chrono::milliseconds(10));
+    }
+    return linesOf(path).size() == count;
+}
+
+template <class Body> int exitStatusOfChild(Body body) {
+    const pid_t child = ::fork();
+    if (child == 0) {
+        body();
+    }
+    int status = -1;
+    ::waitpid(child, &status, 0);
+    return WIFEXITED(status) ? WEXITSTATUS(status) : -1;
+}
 
 class FileSinkTest : public testing::Test {
 protected:
@@ -163,6 +202,105 @@ TEST_F(FileSinkTest, Lines_of_several_processes_stay_whole) {
         const std::string text = line.substr(std::min(line.size(), line.find(' ') + 1));
         ASSERT_EQ(text, std::string(5000, text.empty() ? '?' : text.front()));
     }
+}
+
+TEST_F(FileSinkTest, Gathered_lines_appear_though_no_other_follows) {
+    Output output(fileAt(path));
+    ASSERT_EQ(output.write(kProgress, "first"), std::nullopt);
+    EXPECT_TRUE(awaitLines(path, 1));
+    ASSERT_EQ(output.write(kProgress, "second"), std::nullopt);
+    ASSERT_EQ(output.write(kProgress, "third"), std::nullopt);
+    EXPECT_TRUE(awaitLines(path, 3));
+    EXPECT_THAT(textsOf(path), ElementsAre("first", "second", "third"));
+}
+
+TEST_F(FileSinkTest, A_failure_is_written_at_once_behind_what_was_gathered) {
+    Output output(fileAt(path));
+    ASSERT_EQ(output.write(kProgress, "before"), std::nullopt);
+    ASSERT_EQ(output.write(kFailure, "failure"), std::nullopt);
+    EXPECT_THAT(textsOf(path), ElementsAre("before", "failure"));
+}
+
+TEST_F(FileSinkTest, More_lines_than_the_buffer_holds_lose_nothing) {
+    constexpr int lines = 2000;
+    {
+        Output output(fileAt(path));
+        for (int line = 0; line < lines; ++line) {
+            ASSERT_EQ(output.write(kProgress, std::to_string(line) + std::string(100, '.')),
+                      std::nullopt);
+        }
+    }
+    const auto texts = textsOf(path);
+    ASSERT_THAT(texts, SizeIs(lines));
+    for (int line = 0; line < lines; ++line) {
+        ASSERT_EQ(texts[static_cast<std::size_t>(line)],
+                  std::to_string(line) + std::string(100, '.'));
+    }
+}
+
+TEST_F(FileSinkTest, Without_a_buffer_a_process_that_ends_abruptly_loses_no_line) {
+    const int status = exitStatusOfChild([&] {
+        Output output(unbufferedFileAt(path));
+        output.write(kProgress, "first");
+        output.write(kProgress, "second");
+        ::_exit(7);
+    });
+    EXPECT_EQ(status, 7);
+    EXPECT_THAT(textsOf(path), ElementsAre("first", "second"));
+}
+
+TEST_F(FileSinkTest, A_child_process_does_not_repeat_what_its_parent_gathered) {
+    Output output(fileAt(path));
+    ASSERT_EQ(output.write(kProgress, "parent"), std::nullopt);
+    const int status = exitStatusOfChild([&] {
+        output.write(kProgress, "child");
+        ::_exit(awaitLines(path, 2) ? 0 : 1);
+    });
+    EXPECT_EQ(status, 0);
+    ASSERT_EQ(output.write(kFailure, "parent again"), std::nullopt);
+    EXPECT_THAT(textsOf(path), ElementsAre("parent", "child", "parent again"));
+}
+
+TEST_F(FileSinkTest, Gathered_lines_that_could_not_be_written_are_told_with_the_next_one) {
+    Output output(fileAt("/dev/full"));
+    std::optional<std::string> told;
+    for (int i = 0; i < 1000 && !told; ++i) {
+        told = output.write(kProgress, "line");
+        std::this_thread::sleep_for(std::chrono::milliseconds(10));
+    }
+    EXPECT_EQ(told, "No space left on device");
+}
+
+TEST_F(FileSinkTest, Lines_gathered_before_their_file_was_moved_away_go_with_it) {
+    Output output(fileAt(path));
+    ASSERT_EQ(output.write(kFailure, "first"), std::nullopt);
+    std::this_thread::sleep_for(kLongerThanTheCheckInterval);
+    ASSERT_EQ(output.write(kProgress, "second"), std::nullopt);
+    std::filesystem::rename(path, scratch.at("log.1"));
+    std::this_thread::sleep_for(kLongerThanTheCheckInterval);
+    ASSERT_EQ(output.write(kFailure, "third"), std::nullopt);
+    EXPECT_THAT(textsOf(scratch.at("log.1")), ElementsAre("first", "second"));
+    EXPECT_THAT(textsOf(path), ElementsAre("third"));
+}
+
+TEST_F(FileSinkTest, Threads_that_share_a_buffer_lose_nothing) {
+    constexpr std::size_t threads = 4;
+    constexpr std::size_t lines = 3000;
+    {
+        Output output(fileAt(path));
+        std::vector<std::thread> writers;
+        for (std::size_t writer = 0; writer < threads; ++writer) {
+            writers.emplace_back([&] {
+                for (std::size_t line = 0; line < lines; ++line) {
+                    output.write(line % 100 == 0 ? kFailure : kProgress, "line");
+                }
+            });
+        }
+        for (std::thread& writer : writers) {
+            writer.join();
+        }
+    }
+    EXPECT_THAT(textsOf(path), AllOf(SizeIs(threads * lines), Each("line")));
 }
 
 TEST_F(FileSinkTest, An_output_that_goes_nowhere_takes_every_line) {

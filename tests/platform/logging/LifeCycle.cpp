@@ -11,7 +11,7 @@ namespace {
 void logLine(const char* moment) {
     CvLog::CvMessageBuffer buffer;
     static_cast<std::ostream&>(buffer) << moment;
-    CvLog::CvLogger::logLevelMessage("life", "LifeCycle", 1, "Corvane.LifeCycle", 6000, nullptr, 0,
+    CvLog::CvLogger::logLevelMessage("life", "LifeCycle", 1, "Corvane.LifeCycle", 3000, nullptr, 0,
                                      0, buffer.str(buffer));
 }
 

@@ -26,7 +26,7 @@ int run(const char* program) {
 TEST(LifeCycle, Every_moment_from_before_main_to_after_exit_can_log) {
     const Scratch scratch;
     const std::string log = scratch.at("log");
-    writeFile(scratch.at("logging.conf"), "log = file:" + log + "\n");
+    writeFile(scratch.at("logging.conf"), "log = file:" + log + "\nlog.level = 0\n");
     ::setenv("QELO_LOG_CONFIG", scratch.at("logging.conf").c_str(), 1);
     EXPECT_EQ(run(LIFE_CYCLE_PROGRAM), 0);
     ::unsetenv("QELO_LOG_CONFIG");

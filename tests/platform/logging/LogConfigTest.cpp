@@ -172,6 +172,27 @@ TEST(LogConfig, The_number_of_components_is_bounded) {
     EXPECT_EQ(logThreshold(config, "c0"), 9);
 }
 
+TEST(LogConfig, Lines_of_a_file_are_gathered_unless_that_is_turned_off) {
+    const LogConfig config = parseConfig("log.buffer = off\nlog = file:/l\ntrace = file:/t\n");
+    EXPECT_FALSE(config.of(Channel::Log).target.buffered);
+    EXPECT_TRUE(config.of(Channel::Trace).target.buffered);
+    EXPECT_TRUE(parseConfig("log.buffer=off\nlog.buffer=on").of(Channel::Log).target.buffered);
+}
+
+TEST(LogConfig, A_buffer_is_on_or_off) {
+    const LogConfig config = parseConfig("trace.buffer = 10\n");
+    ASSERT_THAT(config.problems, SizeIs(1));
+    EXPECT_EQ(config.problems[0].text, "neither on nor off: \"10\"");
+    EXPECT_TRUE(config.of(Channel::Trace).target.buffered);
+}
+
+TEST(LogConfig, Two_channels_into_one_file_are_gathered_only_where_both_may_be) {
+    const LogConfig config =
+        parseConfig("log = file:/f\ntrace = file:/f\nlog.buffer = off\ntrace.buffer = on\n");
+    EXPECT_FALSE(config.of(Channel::Log).target.buffered);
+    EXPECT_FALSE(config.of(Channel::Trace).target.buffered);
+}
+
 // The shipped file shows the defaults as comments; each must be a setting once uncommented.
 TEST(LogConfig, The_shipped_file_sets_nothing_and_shows_only_valid_settings) {
     EXPECT_THAT(parseConfig(qelo::test::readFile(SHIPPED_CONFIG)).problems, IsEmpty());
@@ -183,7 +204,7 @@ TEST(LogConfig, The_shipped_file_sets_nothing_and_shows_only_valid_settings) {
             ++settings;
         }
     }
-    EXPECT_EQ(settings, 6);
+    EXPECT_EQ(settings, 8);
 }
 
 // Mutates texts made of the format's own pieces, which random bytes alone would never form.

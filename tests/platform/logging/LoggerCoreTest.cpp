@@ -31,7 +31,9 @@ protected:
         return core.admissionOf(component).thresholds[static_cast<std::size_t>(channel)];
     }
 
-    static Line line(std::string_view message) { return {"f", "u", 1, "a", 6000, message}; }
+    static Line line(std::string_view message, int level = 6000) {
+        return {"f", "u", 1, "a", level, message};
+    }
 
     Scratch scratch;
     const std::string config = scratch.at("logging.conf");
@@ -93,6 +95,19 @@ TEST_F(LoggerCoreTest, Log_and_trace_go_to_their_own_files) {
     core.write(Channel::Trace, line("to the trace"));
     EXPECT_THAT(readFile(log), EndsWith(" to the log\n"));
     EXPECT_THAT(readFile(trace), EndsWith(" to the trace\n"));
+}
+
+TEST_F(LoggerCoreTest, Log_and_trace_in_one_file_keep_their_order) {
+    configure(logToFile() + "trace = file:" + log + "\ntrace.level = 0\n");
+    LoggerCore core(config, 1h);
+    core.write(Channel::Trace, line("progress", 3000));
+    core.write(Channel::Log, line("more progress", 3000));
+    core.write(Channel::Log, line("failure", 6000));
+    const auto lines = linesOf(log);
+    ASSERT_THAT(lines, SizeIs(3));
+    EXPECT_THAT(lines[0], EndsWith(" progress"));
+    EXPECT_THAT(lines[1], EndsWith(" more progress"));
+    EXPECT_THAT(lines[2], EndsWith(" failure"));
 }
 
 TEST_F(LoggerCoreTest, Problems_are_told_once_on_the_log_with_their_line) {

@@ -135,7 +135,10 @@ private:
 inline void insertParameter(CvLog::CvMessageBuffer& list, const std::string& value) {
     list << value;
 }
-inline void insertParameter(CvLog::CvMessageBuffer& list, const char* value) { list << value; }
+// A null text adds nothing; not every stream of characters takes one.
+inline void insertParameter(CvLog::CvMessageBuffer& list, const char* value) {
+    list << (value != nullptr ? value : "");
+}
 inline void insertParameter(CvLog::CvMessageBuffer& list, unsigned int value) { list << value; }
 inline void insertParameter(CvLog::CvMessageBuffer& list, unsigned short value) {
     list << static_cast<unsigned int>(value);

@@ -23,6 +23,8 @@ struct Accounts {
     static constexpr const char* allPathsFailed = "getAllSimAccountCMPIObjPaths Failed";
     static constexpr const char* allInstancesFailed = "getAllSimAccountCMPIInstances Failed";
     static constexpr const char* oneFailed = "getOneSimAccountCMPIInstance Failed";
+    static constexpr bool everyCallReports = true;
+    static constexpr bool exitLineWithoutKeys = true;
     static constexpr const char* key = "Name";
     static void refresh() { refreshGroupUserInfo(); }
 };

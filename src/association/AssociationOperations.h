@@ -169,9 +169,10 @@ CMPIStatus enumAssociations(const MarkerLines& lines, const AssociationRequest& 
 template <class Association>
 CMPIStatus getAssociation(const MarkerLines& lines, const AssociationRequest& request) {
     return associationOperation(lines, request, [&](CMPIStatus* status) {
-        if (!hasKeys(request.ref, status)) {
+        CMPIStatus aside = succeeded;
+        if (!hasKeys(request.ref, &aside)) {
             lines.failed(keyMissingText);
-            finish(lines, request.result);
+            CMReturnDone(request.result);
             return;
         }
         std::vector<CMPIInstance*> instances;
@@ -179,7 +180,7 @@ CMPIStatus getAssociation(const MarkerLines& lines, const AssociationRequest& re
                                 status)) {
             return;
         }
-        if (CMPIInstance* found = findByPath(request.ref, instances, status); found != nullptr) {
+        if (CMPIInstance* found = findByPath(request.ref, instances, &aside); found != nullptr) {
             CMReturnInstance(request.result, found);
         }
         finish(lines, request.result);

@@ -85,14 +85,14 @@ bool returnNearInstances(const MarkerLines& lines, const AssociationRequest& req
     return true;
 }
 
-// Visits the near paths, placed like `ref`; false, with `failedText` said, when they cannot be
-// had.
+// Visits the near paths, about `expected` of them, placed like `ref`; false, with `failedText`
+// said, when they cannot be had.
 template <class Factory, class Visit>
 bool forEachNearPath(const MarkerLines& lines, const AssociationRequest& request,
-                     const CMPIObjectPath* ref, Factory& factory, const char* failedText,
-                     CMPIStatus* status, Visit visit) {
+                     const CMPIObjectPath* ref, Factory& factory, std::size_t expected,
+                     const char* failedText, CMPIStatus* status, Visit visit) {
     std::vector<CMPIObjectPath*> paths;
-    paths.reserve(factory.getNumberOfInstances());
+    paths.reserve(expected);
     if (factory.allPaths(request.broker, ref, paths, status) != 0) {
         lines.failed(failedText);
         return false;
@@ -141,8 +141,8 @@ CMPIStatus associatorNames(const MarkerLines& lines, const AssociationRequest& r
         const Target end = admitted(shape, targetOf(shape, target, status), resultClass);
         if ((end == Target::Far && !forEachFarPath(lines, request, target, status, returnPath)) ||
             (end == Target::Near &&
-             !forEachNearPath(lines, request, target, factory, association::noNearAssociatorNames,
-                              status, returnPath))) {
+             !forEachNearPath(lines, request, target, factory, factory.getNumberOfInstances(),
+                              association::noNearAssociatorNames, status, returnPath))) {
             return;
         }
         finish(lines, request.result);
@@ -179,8 +179,9 @@ CMPIStatus eachReference(const MarkerLines& lines, const AssociationRequest& req
                 place(near, request.ref, status);
                 giveOne(request.ref, near);
             };
-            if (forEachNearPath(lines, request, request.ref, factory, association::noNearReferences,
-                                status, giveNear)) {
+            // Not reserved beforehand: asking for the number would be told in lines of its own.
+            if (forEachNearPath(lines, request, request.ref, factory, 0,
+                                association::noNearReferences, status, giveNear)) {
                 finish(lines, request.result);
             }
             return;

@@ -146,7 +146,9 @@ void returnSamePath(const Lines& lines, const InstanceRequest& request, CMPIStat
     if (!collectAll<Class>(lines, request, factory, instances, status)) {
         return;
     }
-    if (CMPIInstance* found = findByPath(request.ref, instances, status); found != nullptr) {
+    CMPIStatus aside = succeeded;
+    CMPIStatus* told = Class::everyCallReports ? status : &aside;
+    if (CMPIInstance* found = findByPath(request.ref, instances, told); found != nullptr) {
         CMReturnInstance(request.result, found);
     }
     finish(lines, request.result);
@@ -176,16 +178,23 @@ CMPIStatus getInstanceByKeyOrAll(Lines lines, const InstanceRequest& request) {
 }
 
 // GetInstance by the class's key, or, where the request lacks it, by comparing paths. A
-// request without keys is told in a line and answered with nothing.
+// request without keys is told in a line and answered with nothing. A class states
+// `everyCallReports`: whether the request's status receives that of counting keys and of taking
+// an instance's path, and `exitLineWithoutKeys`: whether a request without keys leaves with the
+// exit line.
 template <class Class, class Lines>
 CMPIStatus getInstanceByKeyOrPath(Lines lines, const InstanceRequest& request) {
     return guarded(request.broker, lines.unit(), lines.site(), [&] {
         lines.enter();
         Class::refresh();
         CMPIStatus status = succeeded;
-        if (!hasKeys(request.ref, &status)) {
+        CMPIStatus aside = succeeded;
+        if (!hasKeys(request.ref, Class::everyCallReports ? &status : &aside)) {
             lines.failed(keyMissingText);
-            finish(lines, request.result);
+            CMReturnDone(request.result);
+            if (Class::exitLineWithoutKeys) {
+                lines.leave();
+            }
             return status;
         }
         const CMPIData key = keyOf(request.ref, Class::key);

@@ -25,6 +25,8 @@ struct Capabilities {
         "getAllSimAccountManagementCapabilitiesCMPIInstances Failed";
     static constexpr const char* oneFailed =
         "getOneSimAccountManagementCapabilitiesCMPIInstance Failed";
+    static constexpr bool everyCallReports = false;
+    static constexpr bool exitLineWithoutKeys = false;
     static constexpr const char* key = "InstanceID";
     static void refresh() {} // read from the store anew each time, with no count to compare
 };

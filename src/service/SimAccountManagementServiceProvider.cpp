@@ -24,6 +24,8 @@ struct Services {
     static constexpr const char* allInstancesFailed =
         "getAllSimAccountManagementServiceCMPIInstances Failed";
     static constexpr const char* oneFailed = "getOneSimAccountManagementServiceCMPIInstance Failed";
+    static constexpr bool everyCallReports = false;
+    static constexpr bool exitLineWithoutKeys = false;
     static constexpr const char* key = "Name";
     static void refresh() {} // read from the store anew each time, with no count to compare
 };

@@ -58,7 +58,15 @@ TEST_P(AssociationGet, Without_keys_it_tells_so_and_asks_nobody) {
     EXPECT_EQ(broker_.doneCount(), 1);
     EXPECT_EQ(broker_.callCount("enumerateInstanceNames"), 0U);
     EXPECT_EQ(platform_.storeCallCount(), 0U);
-    expectLines(operation, true, {"At least one key should be passed"});
+    expectLines(operation, false, {"At least one key should be passed"});
+}
+
+TEST_P(AssociationGet, Keys_that_cannot_be_counted_are_none) {
+    serveTwoAndThree();
+    broker_.failSlot("getKeyCount", 1, broken_);
+    expectOk(getInstance(keysOf("zeta", "/a")));
+    expectNothingReturned();
+    EXPECT_EQ(broker_.doneCount(), 1);
 }
 
 TEST_P(AssociationGet, The_property_list_goes_to_the_brokers_own_filter) {

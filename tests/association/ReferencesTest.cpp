@@ -29,6 +29,14 @@ TEST_P(References, From_a_far_object_there_is_one_for_each_near_object) {
     expectNormalEnd(outcome, "References");
 }
 
+TEST_P(References, The_near_objects_are_not_counted_beforehand) {
+    serveTwoAndThree();
+    fromFar();
+    EXPECT_THAT(pointsIn("getNumberOfInstances"), IsEmpty());
+    associatorNames(farPath("alpha"), along());
+    EXPECT_THAT(pointsIn("getNumberOfInstances"), testing::Not(IsEmpty()));
+}
+
 TEST_P(References, From_a_near_object_there_is_one_for_each_far_object) {
     serveTwoAndThree();
     const Outcome outcome = fromNear();

@@ -48,6 +48,13 @@ TEST_P(CapabilitiesArrays, Getting_one_instance_tells_the_same) {
     EXPECT_THAT(broker_.traces(), ElementsAre(BrokerTrace{2, component, traceText(GetParam())}));
 }
 
+TEST_P(CapabilitiesArrays, Comparing_paths_does_not_forget_it) {
+    platform_.setPathAnswers({true});
+    broker_.failSlot("newArray", 1, Fault::null());
+    expectFailed(getInstance({{"Name", "other"}}, {{GetParam()}}), statusText(GetParam()));
+    EXPECT_THAT(onlyInstance().propertyNames(), ElementsAre("InstanceID"));
+}
+
 INSTANTIATE_TEST_SUITE_P(Lists, CapabilitiesArrays,
                          testing::Values("RequestedStatesSupported", "OperationsSupported"),
                          [](const auto& test) { return std::string(test.param); });

@@ -38,10 +38,12 @@ public:
 
     template <class T> T* makeArray(std::size_t count) {
         static_assert(std::is_trivially_copyable_v<T>);
-        if (count > SIZE_MAX / sizeof(T)) {
+        // Of a pointer, the pointer itself is meant.
+        constexpr std::size_t size = sizeof(T); // NOLINT(bugprone-sizeof-expression)
+        if (count > SIZE_MAX / size) {
             throw std::bad_alloc();
         }
-        return static_cast<T*>(allocate(count * sizeof(T)));
+        return static_cast<T*>(allocate(count * size));
     }
 
     // The string object of a name, the same one for the same spelling. `hash` is nameHash().

@@ -122,7 +122,7 @@ CMPIMsgFileHandle Broker::openCatalog(const std::string& file) {
     if (!*catalog) {
         return nullptr;
     }
-    const CMPIMsgFileHandle handle = catalog.get();
+    CMPIMsgFileHandle handle = catalog.get();
     std::lock_guard lock(mutex_);
     catalogs_.emplace(handle, std::move(catalog));
     return handle;

@@ -53,7 +53,8 @@ bool isAllowed(CMPIType type, ValueUse use) {
 // less aligned than a CMPIValue: exactly the bytes of that type are read.
 template <class T> T readAs(const void* value) {
     T out = {};
-    std::memcpy(&out, value, sizeof out);
+    // Of a pointer, the pointer itself is meant.
+    std::memcpy(&out, value, sizeof out); // NOLINT(bugprone-sizeof-expression)
     return out;
 }
 

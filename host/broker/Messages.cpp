@@ -84,7 +84,7 @@ std::string expand(const std::string& pattern, const MessageArguments& arguments
 // The translation if there is one, else the default text.
 std::string patternOf(const Broker& broker, CMPIMsgFileHandle file, const char* messageId,
                       const char* defaultText) {
-    const std::string fallback = defaultText ? defaultText : "";
+    std::string fallback = defaultText ? defaultText : "";
     if (!file) {
         return fallback;
     }
@@ -122,7 +122,7 @@ CMPIString* getMessage(const CMPIBroker* mb, const char* messageId, const char* 
     return text;
 }
 
-CMPIString* getMessage2(const CMPIBroker* mb, const char* messageId, const CMPIMsgFileHandle file,
+CMPIString* getMessage2(const CMPIBroker* mb, const char* messageId, CMPIMsgFileHandle file,
                         const char* defaultText, CMPIStatus* st, CMPICount count, ...) {
     va_list list;
     va_start(list, count);
@@ -150,7 +150,7 @@ CMPIStatus openMessageFile(const CMPIBroker* mb, const char* file, CMPIMsgFileHa
     });
 }
 
-CMPIStatus closeMessageFile(const CMPIBroker* mb, const CMPIMsgFileHandle handle) {
+CMPIStatus closeMessageFile(const CMPIBroker* mb, CMPIMsgFileHandle handle) {
     return statusSlot([&] {
         Broker& broker = aliveBroker(mb);
         if (handle && !broker.closeCatalog(handle)) {

@@ -10,10 +10,10 @@ namespace qelo::broker {
 // NOLINTBEGIN(cert-dcl50-cpp)
 CMPIString* getMessage(const CMPIBroker* mb, const char* messageId, const char* defaultText,
                        CMPIStatus* st, CMPICount count, ...);
-CMPIString* getMessage2(const CMPIBroker* mb, const char* messageId, const CMPIMsgFileHandle file,
+CMPIString* getMessage2(const CMPIBroker* mb, const char* messageId, CMPIMsgFileHandle file,
                         const char* defaultText, CMPIStatus* st, CMPICount count, ...);
 // NOLINTEND(cert-dcl50-cpp)
 CMPIStatus openMessageFile(const CMPIBroker* mb, const char* file, CMPIMsgFileHandle* handle);
-CMPIStatus closeMessageFile(const CMPIBroker* mb, const CMPIMsgFileHandle handle);
+CMPIStatus closeMessageFile(const CMPIBroker* mb, CMPIMsgFileHandle handle);
 
 } // namespace qelo::broker

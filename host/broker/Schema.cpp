@@ -34,7 +34,8 @@ SchemaHooks schemaHooks(std::shared_ptr<const schema::ClassRepository> repositor
     hooks.findClass = [repository](const std::string& nameSpace, const std::string& className) {
         return repository->find(nameSpace, className);
     };
-    hooks.instances = [repository](const std::string& nameSpace, const std::string& className) {
+    hooks.instances = [repository = std::move(repository)](const std::string& nameSpace,
+                                                           const std::string& className) {
         return instancesBelow(*repository, nameSpace, className);
     };
     return hooks;

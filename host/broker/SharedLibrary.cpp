@@ -38,7 +38,8 @@ std::string findLibrary(const std::string& name, const std::vector<std::string>&
     }
     for (const std::string& directory : directories) {
         for (const char* suffix : {".so", ".so.1"}) {
-            std::string path = directory + "/lib" + name + suffix;
+            std::string path = directory;
+            path.append("/lib").append(name).append(suffix);
             if (access(path.c_str(), F_OK) == 0) {
                 return path;
             }

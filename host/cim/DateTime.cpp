@@ -143,8 +143,8 @@ std::string pointText(std::uint64_t seconds, std::uint64_t fraction) {
     std::tm parts{};
     gmtime_r(&when, &parts);
     std::string text;
-    appendPadded(text, static_cast<std::uint64_t>(parts.tm_year + 1900), 4);
-    appendPadded(text, static_cast<std::uint64_t>(parts.tm_mon + 1), 2);
+    appendPadded(text, static_cast<std::uint64_t>(parts.tm_year) + 1900, 4);
+    appendPadded(text, static_cast<std::uint64_t>(parts.tm_mon) + 1, 2);
     appendPadded(text, static_cast<std::uint64_t>(parts.tm_mday), 2);
     appendClock(text, seconds % kSecondsPerDay, fraction);
     return text + "+000";

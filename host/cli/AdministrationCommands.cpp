@@ -48,7 +48,7 @@ const Choice kCreateHome = {"--create-home", "CreateHome", Kind::Flag, "Make the
 const Choice kPasswordStdin = {"--password-stdin", "UserPassword", Kind::PasswordLine,
                                "Read the password from standard input"};
 
-std::vector<Form> forms() {
+std::vector<Form> accountForms() {
     return {
         {"create-user",
          "Create an account",
@@ -114,6 +114,11 @@ std::vector<Form> forms() {
          {},
          false,
          "disabled account"},
+    };
+}
+
+std::vector<Form> groupForms() {
+    return {
         {"create-group",
          "Create a group",
          kGroupClass,
@@ -283,7 +288,11 @@ void addForm(CLI::App& app, Invocation& invocation, const Form& form) {
 } // namespace
 
 void addAdministrationCommands(CLI::App& app, Invocation& invocation) {
-    for (const Form& form : forms()) {
+    std::vector<Form> forms = accountForms();
+    for (Form& form : groupForms()) {
+        forms.push_back(std::move(form));
+    }
+    for (const Form& form : forms) {
         addForm(app, invocation, form);
     }
 }

@@ -7,6 +7,8 @@
 #include "local/ServeCommand.h"
 #include "remote/ServerConnection.h"
 
+#include <secrecy/Process.h>
+
 #include <clocale>
 #include <csignal>
 #include <cstring>
@@ -30,10 +32,11 @@ void occupyStandardDescriptors() {
 
 // Results are UTF-8 whatever the environment says; messages follow the environment.
 void chooseLanguage() {
-    setlocale(LC_MESSAGES, "");
-    setlocale(LC_CTYPE, "");
+    // One that is not installed leaves the C locale, which will do.
+    (void)setlocale(LC_MESSAGES, "");
+    (void)setlocale(LC_CTYPE, "");
     if (std::strcmp(nl_langinfo(CODESET), "UTF-8") != 0) {
-        setlocale(LC_CTYPE, "C.UTF-8");
+        (void)setlocale(LC_CTYPE, "C.UTF-8");
     }
 }
 
@@ -45,9 +48,12 @@ std::unique_ptr<qelo::client::Connection> connect(const qelo::cli::Options& opti
 } // namespace
 
 int main(int argc, char** argv) {
+    // Passwords and their hashes pass through this process.
+    qelo::secrecy::keepMemoryPrivate();
+    argv = qelo::secrecy::hideSecrets(argc, argv);
     occupyStandardDescriptors();
     // A reader that goes is noticed when writing fails.
-    std::signal(SIGPIPE, SIG_IGN);
+    (void)std::signal(SIGPIPE, SIG_IGN);
     chooseLanguage();
     qelo::cli::FileOutput output(STDOUT_FILENO);
     qelo::cli::FileOutput errors(STDERR_FILENO);

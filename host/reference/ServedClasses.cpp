@@ -73,6 +73,7 @@ std::vector<ServedClass> askProviders(const fs::path& schemaFolder, const fs::pa
     std::vector<ServedClass> classes;
     const auto registrations = registrationsOf(schemaFolder);
     dispatcher.add(registrations);
+    classes.reserve(registrations.size());
     for (const broker::ProviderRegistration& registration : registrations) {
         classes.push_back({registration, propertiesOf(dispatcher, registration)});
     }

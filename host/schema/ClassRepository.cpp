@@ -190,7 +190,7 @@ void ClassRepository::add(std::string_view nameSpace, cim::QualifierType type) {
     place.qualifierTypes.emplace(key, std::move(kept));
 }
 
-cim::ObjectPath ClassRepository::add(std::string_view nameSpace, cim::Instance instance) {
+cim::ObjectPath ClassRepository::add(std::string_view nameSpace, const cim::Instance& instance) {
     NameSpace& place = impl_->added(nameSpace);
     Node* node = place.find(instance.className());
     if (node == nullptr) {

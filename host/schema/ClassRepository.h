@@ -36,7 +36,7 @@ public:
     void add(std::string_view nameSpace, cim::QualifierType type);
     // A static instance; its keys are taken from its class, and properties that it does not
     // give a value from their defaults. Returns its path.
-    cim::ObjectPath add(std::string_view nameSpace, cim::Instance instance);
+    cim::ObjectPath add(std::string_view nameSpace, const cim::Instance& instance);
 
     // The resolved class, or null. Valid as long as the repository.
     const cim::Class* find(std::string_view nameSpace, std::string_view className) const;

@@ -38,7 +38,10 @@ std::vector<std::string> includesOf(const MofSource& source) {
             if (token.kind == TokenKind::String && last == "#pragmainclude(") {
                 targets.push_back(token.value);
             }
-            last = token.text == "#" ? "#" : last + std::string(token.text);
+            if (token.text == "#") {
+                last.clear();
+            }
+            last += token.text;
             if (last.size() > std::string_view("#pragmainclude(").size()) {
                 last.clear();
             }

@@ -11,7 +11,7 @@
 namespace qelo::server {
 namespace {
 
-constexpr std::size_t kLargestEntry = 16 * 1024 * 1024; // a group may have very many members
+constexpr std::size_t kLargestEntry = 16UL * 1024 * 1024; // a group may have very many members
 
 // Calls one of the C library's getXXnam_r functions with a buffer that is large enough.
 template <class Entry, class Function>

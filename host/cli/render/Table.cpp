@@ -44,7 +44,7 @@ void shrink(std::vector<std::size_t>& widths, std::size_t available, std::size_t
 
 } // namespace
 
-Cell::Cell(std::string content, Emphasis how) : text(displayText(content)), emphasis(how) {}
+Cell::Cell(const std::string& content, Emphasis how) : text(displayText(content)), emphasis(how) {}
 
 Table::Table(std::vector<Column> columns) : columns_(std::move(columns)) {
     for (const Column& column : columns_) {

@@ -20,8 +20,9 @@ struct Column {
 };
 
 struct Cell {
-    Cell(std::string content = {}, Emphasis how = Emphasis::None); // NOLINT: a text is a cell
-    std::string text;                                              // displayable
+    Cell(const std::string& content = {},
+         Emphasis how = Emphasis::None); // NOLINT: a text is a cell
+    std::string text;                    // displayable
     Emphasis emphasis;
 };
 

@@ -47,8 +47,12 @@ std::int64_t signedLimit(Type type) {
     }
 }
 
+// The first number that no longer rounds to the largest real32, whose own text, being the
+// shortest one, may denote a number slightly above it.
+constexpr double kBeyondReal32 = 0x1.ffffffp127;
+
 double roundedTo32(double value) {
-    if (std::isfinite(value) && std::fabs(value) > std::numeric_limits<float>::max()) {
+    if (std::isfinite(value) && std::fabs(value) >= kBeyondReal32) {
         refuse(Type::Real32, "value out of range");
     }
     return static_cast<double>(static_cast<float>(value));

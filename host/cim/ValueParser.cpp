@@ -118,13 +118,14 @@ std::optional<Value> parseReal(Type type, std::string_view text, std::string& er
         error = "a number is expected";
         return std::nullopt;
     }
-    const double limit = type == Type::Real32 ? std::numeric_limits<float>::max()
-                                              : std::numeric_limits<double>::max();
-    if (code == std::errc::result_out_of_range || std::fabs(number) > limit) {
-        error = std::string("the number is out of the range of ") + typeName(type);
-        return std::nullopt;
+    if (code != std::errc::result_out_of_range) {
+        try {
+            return Value::real(type, number);
+        } catch (const std::invalid_argument&) { // too large for a real32
+        }
     }
-    return Value::real(type, number);
+    error = std::string("the number is out of the range of ") + typeName(type);
+    return std::nullopt;
 }
 
 std::optional<Value> parseCharacter(std::string_view text, std::string& error) {

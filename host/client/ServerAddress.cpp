@@ -38,6 +38,10 @@ std::string problemOf(const Url& url) {
     if (part(url, CURLUPART_PORT).value_or("1") == "0") {
         return "port 0 is nobody's";
     }
+    // Left over from an escape of an escape, which would be taken for one the next time.
+    if (part(url, CURLUPART_HOST).value_or("").find('%') != std::string::npos) {
+        return "no host is called that";
+    }
     return {};
 }
 

@@ -34,7 +34,9 @@ PasswordPolicy readPolicy(SnapshotBuilder& builder) {
     reader.readHistory(readSettingsFile(builder, directory + "pwhistory.conf"));
     for (const std::string& name : builder.list(directory + "pwquality.conf.d")) {
         if (isConfigName(name)) {
-            reader.readQuality(readSettingsFile(builder, directory + "pwquality.conf.d/" + name));
+            std::string path = directory;
+            path.append("pwquality.conf.d/").append(name);
+            reader.readQuality(readSettingsFile(builder, path));
         }
     }
     reader.readQuality(readSettingsFile(builder, directory + "pwquality.conf"));

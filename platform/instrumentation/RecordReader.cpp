@@ -27,7 +27,8 @@ RecordStream::RecordStream(std::string& text, RecordLines& lines)
     if (!stream_) {
         throw std::bad_alloc();
     }
-    std::setvbuf(stream_.get(), streamBuffer_.data(), _IOFBF, streamBuffer_.size());
+    // Refused, the stream has a buffer of its own.
+    (void)std::setvbuf(stream_.get(), streamBuffer_.data(), _IOFBF, streamBuffer_.size());
 }
 
 RecordStream::~RecordStream() {

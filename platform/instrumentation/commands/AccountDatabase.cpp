@@ -5,6 +5,7 @@
 #include <algorithm>
 #include <array>
 #include <charconv>
+#include <limits>
 
 namespace qelo::store {
 
@@ -14,16 +15,38 @@ constexpr std::size_t kPasswdFields = 7;
 constexpr std::size_t kShadowFields = 9;
 constexpr std::size_t kGroupFields = 4;
 
+// The system's own mark for "no such number".
+constexpr std::uint32_t kNoId = std::numeric_limits<std::uint32_t>::max();
+
+constexpr std::string_view kBlanks = " \t\r\v\f";
+
+// The name of a line as the system's look-ups see it: they pass over blanks before it.
+std::string_view nameIn(std::string_view line) {
+    const std::size_t start = line.find_first_not_of(kBlanks);
+    return start == std::string_view::npos ? std::string_view() : keyOf(line.substr(start));
+}
+
+// Whether a line is one of `key` for the tools or for the system's look-ups.
+bool isLineOf(std::string_view line, std::string_view key) {
+    return keyOf(line) == key || nameIn(line) == key;
+}
+
+// Whether the two read a line of `key` alike.
+bool isClear(const std::string& line, std::string_view key) {
+    return keyOf(line) == key && line.find('\0') == std::string::npos;
+}
+
 bool hasKey(const Lines& lines, const std::string& key) {
     return std::any_of(lines.begin(), lines.end(),
-                       [&](const std::string& line) { return keyOf(line) == key; });
+                       [&](const std::string& line) { return isLineOf(line, key); });
 }
 
 std::optional<std::uint32_t> parseId(const std::string& text) {
     std::uint32_t id = 0;
     const auto end = text.data() + text.size();
     const auto read = std::from_chars(text.data(), end, id);
-    return read.ec == std::errc() && read.ptr == end ? std::optional(id) : std::nullopt;
+    const bool whole = read.ec == std::errc() && read.ptr == end && id != kNoId;
+    return whole ? std::optional(id) : std::nullopt;
 }
 
 // Whether some line has the number `id` in its third field. A number that the C library would
@@ -46,16 +69,18 @@ Attempt<Fields> onlyLine(const Lines& lines, const std::string& key, std::size_t
     if (isNoEntry(key)) {
         return found;
     }
+    bool clear = true;
     for (const std::string& line : lines) {
-        if (keyOf(line) != key) {
+        if (!isLineOf(line, key)) {
             continue;
         }
         if (found) {
             return Refusal{"the " + what + " is there twice"};
         }
         found = splitFields(line, ':');
+        clear = isClear(line, key);
     }
-    if (found && found->size() != count) {
+    if (found && (!clear || found->size() != count)) {
         return Refusal{"the " + what + " is malformed"};
     }
     return found;

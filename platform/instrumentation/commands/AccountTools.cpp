@@ -24,7 +24,7 @@ constexpr const char* kGpasswd = "/usr/bin/gpasswd";
 constexpr std::chrono::seconds kContentionLimit{60};
 constexpr std::chrono::milliseconds kContentionPause{50};
 
-constexpr long kSecondsPerDay = 24 * 60 * 60;
+constexpr long kSecondsPerDay = 24L * 60 * 60;
 
 // "--name=value", so that no value can be taken for an option.
 template <typename T> std::string option(const char* name, const T& value) {

@@ -8,7 +8,7 @@ namespace qelo::store {
 namespace {
 
 constexpr std::size_t kLength = 25;
-constexpr long kMinutesPerDay = 24 * 60;
+constexpr long kMinutesPerDay = 24L * 60;
 
 bool isDigit(char c) { return c >= '0' && c <= '9'; }
 

@@ -110,7 +110,7 @@ Attempt<std::string> addMember(const Workplace& workplace, const CommandRequest&
     if (!group || !account) {
         return group ? account.refusal() : group.refusal();
     }
-    const std::string status =
+    std::string status =
         "User " + printable(member) + " is a member of group " + printable(request.name) + ".";
     if (group->hasMember(member)) {
         return status;

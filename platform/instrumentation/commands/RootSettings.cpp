@@ -24,7 +24,7 @@ std::optional<std::string> valueOf(const std::string& text, const std::string& k
             continue;
         }
         const std::size_t end = start + key.size();
-        const std::size_t from = line.find_first_not_of(" \t=", end);
+        const std::size_t from = line.find_first_not_of(" \t\r=", end);
         if (from != std::string::npos && from != end) {
             value = line.substr(from, line.find_last_not_of(" \t\r") + 1 - from);
         }

@@ -28,7 +28,7 @@ void tell(ToolReport::Kind kind, int code) {
 
 void resetSignals() {
     for (int signal = 1; signal < NSIG; ++signal) {
-        ::signal(signal, SIG_DFL);
+        (void)::signal(signal, SIG_DFL);
     }
 }
 

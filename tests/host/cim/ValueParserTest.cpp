@@ -3,6 +3,7 @@
 #include <gtest/gtest.h>
 
 #include <cmath>
+#include <limits>
 
 namespace qelo::cim {
 namespace {
@@ -106,6 +107,15 @@ TEST(ValueParser, What_is_no_real_is_refused) {
     }
     EXPECT_EQ(problem(Type::Real64, "1e999"), "the number is out of the range of real64");
     EXPECT_EQ(problem(Type::Real32, "1e39"), "the number is out of the range of real32");
+}
+
+TEST(ValueParser, The_largest_real32_is_read_as_it_is_printed) {
+    constexpr double largest = std::numeric_limits<float>::max();
+    const std::string printed = Value::real(Type::Real32, largest).toText();
+    EXPECT_EQ(printed, "3.4028235e+38"); // a little more than the number itself
+    EXPECT_EQ(parse(Type::Real32, printed)->asReal(), largest);
+    EXPECT_EQ(parse(Type::Real32, "-" + printed)->asReal(), -largest);
+    EXPECT_EQ(problem(Type::Real32, "3.4028236e38"), "the number is out of the range of real32");
 }
 
 TEST(ValueParser, A_char16_is_exactly_one_character) {

@@ -98,6 +98,14 @@ TEST_F(Home, Follows_the_settings_of_the_root) {
     fs::remove_all(etc("other"));
 }
 
+TEST_F(Home, Settings_without_a_value_are_none) {
+    write(etc("login.defs"), "HOME_MODE \r\nUMASK=\r\nHOME_MODE\r\nMAIL_DIR \r\n");
+    write(etc("default/useradd"), "SKEL= \r\n");
+    accept("CreateUser", newUser("alice", "/home/alice"));
+    EXPECT_EQ(0755u, statusOf(root() / "home/alice").st_mode & 07777u);
+    EXPECT_TRUE(fs::exists(root() / "home/alice/.profile")); // of the usual skeleton
+}
+
 TEST_F(Home, That_is_the_users_already_is_left_as_it_is) {
     write(makeOwned("home/alice") / "diary", "old");
     accept("CreateUser", newUser("alice", "/home/alice"));

@@ -116,6 +116,26 @@ TEST_F(Refusal, Accounts_whose_lines_are_not_clear) {
     refuse("CreateUser", {text("Name", "once")});
 }
 
+TEST_F(Refusal, Accounts_that_the_system_reads_otherwise_than_its_tools) {
+    using namespace std::string_literals;
+    addAccountLine(" led:x:901:100::/other:/bin/sh\nled:x:902:100::/h:/bin/sh",
+                   "led:*:19000::::::");
+    addAccountLine("\tonly:x:903:100::/h:/bin/sh", "only:*:19000::::::");
+    addAccountLine("cut:x:904:100::/home\0/h:/bin/sh"s, "cut:*:19000::::::");
+    addAccountLine("dark:x:905:100::/h:/bin/sh", "dark:*\0:19000::::::"s);
+    addAccountLine("nobodys:x:4294967295:100::/h:/bin/sh", "nobodys:*:19000::::::");
+    addAccountLine("ungrouped:x:906:4294967295::/h:/bin/sh", "ungrouped:*:19000::::::");
+    expectFaults();
+    for (const char* name : {"led", "only", "cut", "dark", "nobodys", "ungrouped"}) {
+        for (const char* method : {"DeleteUser", "EnableUser", "DisableUser"}) {
+            refuse(method, {text("Name", name)});
+        }
+        refuse("SetPassword", {text("Name", name), text("UserPassword", "pw")});
+        refuse("CreateUser", {text("Name", name)});
+    }
+    refuse("DeleteUser", {text("Name", "\tonly")});
+}
+
 TEST_F(Refusal, Commands_that_may_have_been_cut) {
     const std::string start =
         command("CreateUser", {text("Name", "alice"), "FullName:CMPI_string:"});

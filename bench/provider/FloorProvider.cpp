@@ -152,7 +152,39 @@ CMPIStatus enumInstances(CMPIInstanceMI*, const CMPIContext*, const CMPIResult* 
     return {CMPI_RC_OK, nullptr};
 }
 
+// Keys are texts. As above: made first, returned then.
+CMPIStatus enumNames(CMPIInstanceMI*, const CMPIContext*, const CMPIResult* result,
+                     const CMPIObjectPath* ref) {
+    const char* nameSpace = CMGetCharPtr(CMGetNameSpace(ref, nullptr));
+    std::vector<CMPIObjectPath*> made;
+    made.reserve(ready.size());
+    for (const ReadyInstance& source : ready) {
+        CMPIObjectPath* path =
+            CMNewObjectPath(broker, nameSpace, source.className.c_str(), nullptr);
+        CMSetHostname(path, host.c_str());
+        for (std::size_t i = 0; i < keyNames.size(); ++i) {
+            CMAddKey(path, keyNames[i].c_str(), source.properties[i].text.c_str(), CMPI_chars);
+        }
+        made.push_back(path);
+    }
+    for (CMPIObjectPath* path : made) {
+        CMReturnObjectPath(result, path);
+    }
+    CMReturnDone(result);
+    return {CMPI_RC_OK, nullptr};
+}
+
+// Does nothing but refuse, as a store does that does not know the command.
+CMPIStatus refuseMethod(CMPIMethodMI*, const CMPIContext*, const CMPIResult*, const CMPIObjectPath*,
+                        const char*, const CMPIArgs*, CMPIArgs*) {
+    return {CMPI_RC_ERR_FAILED, CMNewString(broker, "the method is unknown", nullptr)};
+}
+
 CMPIStatus cleanup(CMPIInstanceMI*, const CMPIContext*, CMPIBoolean) {
+    return {CMPI_RC_OK, nullptr};
+}
+
+CMPIStatus cleanupMethod(CMPIMethodMI*, const CMPIContext*, CMPIBoolean) {
     return {CMPI_RC_OK, nullptr};
 }
 
@@ -188,7 +220,21 @@ FloorProvider_Create_InstanceMI(const CMPIBroker* mb, const CMPIContext*, CMPISt
     table.miName = "instanceFloorProvider";
     table.cleanup = qelo::bench::cleanup;
     table.enumerateInstances = qelo::bench::enumInstances;
+    table.enumerateInstanceNames = qelo::bench::enumNames;
     static CMPIInstanceMI mi = {nullptr, &table};
+    qelo::bench::broker = mb;
+    return &mi;
+}
+
+extern "C" __attribute__((visibility("default"))) CMPIMethodMI*
+FloorProvider_Create_MethodMI(const CMPIBroker* mb, const CMPIContext*, CMPIStatus*) {
+    static CMPIMethodMIFT table = {};
+    table.ftVersion = CMPIVersion200;
+    table.miVersion = CMPIVersion200;
+    table.miName = "methodFloorProvider";
+    table.cleanup = qelo::bench::cleanupMethod;
+    table.invokeMethod = qelo::bench::refuseMethod;
+    static CMPIMethodMI mi = {nullptr, &table};
     qelo::bench::broker = mb;
     return &mi;
 }

@@ -1,10 +1,14 @@
 #include "Characters.h"
 
+#include "Pieces.h"
+
 #include <cim/Utf8.h>
 
+#include <algorithm>
 #include <array>
 #include <charconv>
 #include <cstddef>
+#include <cstdint>
 
 namespace qelo::cimxml {
 namespace {
@@ -88,11 +92,25 @@ template <Care threshold> void appendEscaped(std::string& out, std::string_view 
     out.append(text.data() + plain, position - plain);
 }
 
-template <class Integer> void appendInteger(std::string& out, Integer number) {
-    std::array<char, 24> digits; // 64 bits take at most 20 characters
-    const auto end = std::to_chars(digits.data(), digits.data() + digits.size(), number).ptr;
-    out.append(digits.data(), static_cast<std::size_t>(end - digits.data()));
+template <Care threshold> bool isPlain(std::string_view text) {
+    return std::none_of(text.begin(), text.end(),
+                        [](char c) { return kCare[static_cast<unsigned char>(c)] >= threshold; });
 }
+
+// The digits of a number, as long as this lives.
+class Digits {
+public:
+    template <class Integer>
+    explicit Digits(Integer number)
+        : end_(std::to_chars(digits_.data(), digits_.data() + digits_.size(), number).ptr) {}
+    std::string_view text() const {
+        return {digits_.data(), static_cast<std::size_t>(end_ - digits_.data())};
+    }
+
+private:
+    std::array<char, 24> digits_; // 64 bits take at most 20 characters
+    const char* end_;
+};
 
 } // namespace
 
@@ -110,7 +128,31 @@ void appendAttribute(std::string& out, std::string_view name, std::string_view t
     out += '"';
 }
 
-void appendNumber(std::string& out, std::uint64_t number) { appendInteger(out, number); }
-void appendNumber(std::string& out, std::int64_t number) { appendInteger(out, number); }
+void Pieces::addText(std::string_view text) {
+    if (isPlain<Care::Always>(text)) {
+        add(text);
+    } else {
+        appendText(flush(), text);
+    }
+}
+
+void Pieces::addAttributeText(std::string_view text) {
+    if (isPlain<Care::InAttribute>(text)) {
+        add(text);
+    } else {
+        appendAttributeText(flush(), text);
+    }
+}
+
+void Pieces::addAttribute(std::string_view name, std::string_view text) {
+    add(" ");
+    add(name);
+    add("=\"");
+    addAttributeText(text);
+    add("\"");
+}
+
+void Pieces::addNumber(std::uint64_t number) { add(Digits(number).text()); }
+void Pieces::addNumber(std::int64_t number) { add(Digits(number).text()); }
 
 } // namespace qelo::cimxml

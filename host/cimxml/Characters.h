@@ -2,7 +2,6 @@
 // characters that XML does not know become U+FFFD.
 #pragma once
 
-#include <cstdint>
 #include <string>
 #include <string_view>
 
@@ -17,8 +16,5 @@ void appendAttributeText(std::string& out, std::string_view text);
 
 // name="text", with a blank in front.
 void appendAttribute(std::string& out, std::string_view name, std::string_view text);
-
-void appendNumber(std::string& out, std::uint64_t number);
-void appendNumber(std::string& out, std::int64_t number);
 
 } // namespace qelo::cimxml

@@ -2,6 +2,7 @@
 // here throws but std::bad_alloc.
 #pragma once
 
+#include "Pieces.h"
 #include "ResponseWriter.h"
 
 #include <cim/Class.h>
@@ -18,9 +19,13 @@ void endMessage(std::string& out);
 
 // VALUE, VALUE.ARRAY, VALUE.REFERENCE or VALUE.REFARRAY; nothing for null.
 void appendValue(std::string& out, const cim::Value& value);
+void addValue(Pieces& out, const cim::Value& value);
+// What is inside of it.
+void addContent(Pieces& out, const cim::Value& value);
 
 // TYPE="..." (or another name of the attribute), with EmbeddedObject where needed.
 void appendType(std::string& out, std::string_view attribute, cim::Type type);
+void addType(Pieces& out, std::string_view attribute, cim::Type type);
 
 // PARAMVALUE; without its type if that is not to be told.
 void appendArgument(std::string& out, std::string_view name, const cim::Value& value, bool typed);
@@ -29,6 +34,7 @@ void appendLocalNameSpace(std::string& out, std::string_view nameSpace);
 
 // INSTANCENAME, also for a path without keys.
 void appendInstanceName(std::string& out, const cim::ObjectPath& path);
+void addInstanceName(Pieces& out, const cim::ObjectPath& path);
 
 // INSTANCEPATH, LOCALINSTANCEPATH or INSTANCENAME, or their counterparts for a class if the
 // path has no keys, by what the path itself tells: host, namespace or neither.
@@ -43,6 +49,7 @@ void appendFullPath(std::string& out, const cim::ObjectPath& path, std::string_v
 
 void appendInstance(std::string& out, const cim::Instance& instance,
                     const InstanceOptions& options = {});
+void addInstance(Pieces& out, const cim::Instance& instance, const InstanceOptions& options);
 
 void appendQualifiers(std::string& out, const std::vector<cim::Qualifier>& qualifiers,
                       bool localOnly = false);

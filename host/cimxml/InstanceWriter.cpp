@@ -1,20 +1,25 @@
-#include "Characters.h"
 #include "ElementWriter.h"
 
 namespace qelo::cimxml {
 namespace {
 
-std::string_view elementName(const cim::Value& value) {
+struct Tags {
+    std::string_view begin;
+    std::string_view end;
+};
+
+Tags tagsOf(const cim::Value& value) {
     if (value.type() == cim::Type::Reference) {
-        return "PROPERTY.REFERENCE";
+        return {"<PROPERTY.REFERENCE NAME=\"", "</PROPERTY.REFERENCE>"};
     }
-    return value.isArray() ? "PROPERTY.ARRAY" : "PROPERTY";
+    return value.isArray() ? Tags{"<PROPERTY.ARRAY NAME=\"", "</PROPERTY.ARRAY>"}
+                           : Tags{"<PROPERTY NAME=\"", "</PROPERTY>"};
 }
 
 // The qualifiers of a property are those of its declaration.
 void appendPropertyQualifiers(std::string& out, std::string_view name,
                               const InstanceOptions& options) {
-    if (!options.includeQualifiers || options.declaration == nullptr) {
+    if (options.declaration == nullptr) {
         return;
     }
     if (const auto* declared = options.declaration->property(name)) {
@@ -22,42 +27,46 @@ void appendPropertyQualifiers(std::string& out, std::string_view name,
     }
 }
 
-void appendProperty(std::string& out, const cim::Instance::Property& property,
-                    const InstanceOptions& options) {
-    const std::string_view element = elementName(property.value);
-    out += '<';
-    out += element;
-    out += " NAME=\"";
-    appendAttributeText(out, property.name);
-    out += '"';
+void addProperty(Pieces& out, const cim::Instance::Property& property,
+                 const InstanceOptions& options) {
+    const Tags tags = tagsOf(property.value);
+    out.add(tags.begin);
+    out.addAttributeText(property.name);
+    out.add("\"");
     if (property.value.type() != cim::Type::Reference) {
-        appendType(out, "TYPE", property.value.type());
+        addType(out, "TYPE", property.value.type());
     }
     if (options.includeClassOrigin && !property.origin.empty()) {
-        appendAttribute(out, "CLASSORIGIN", property.origin);
+        out.addAttribute("CLASSORIGIN", property.origin);
     }
-    out += '>';
-    appendPropertyQualifiers(out, property.name, options);
-    appendValue(out, property.value);
-    out += "</";
-    out += element;
-    out += '>';
+    out.add(">");
+    if (options.includeQualifiers) {
+        appendPropertyQualifiers(out.flush(), property.name, options);
+    }
+    addValue(out, property.value);
+    out.add(tags.end);
 }
 
 } // namespace
 
-void appendInstance(std::string& out, const cim::Instance& instance,
-                    const InstanceOptions& options) {
-    out += "<INSTANCE CLASSNAME=\"";
-    appendAttributeText(out, instance.className());
-    out += "\">";
+void addInstance(Pieces& out, const cim::Instance& instance, const InstanceOptions& options) {
+    out.add("<INSTANCE CLASSNAME=\"");
+    out.addAttributeText(instance.className());
+    out.add("\">");
     if (options.includeQualifiers && options.declaration != nullptr) {
-        appendQualifiers(out, options.declaration->qualifiers);
+        appendQualifiers(out.flush(), options.declaration->qualifiers);
     }
     for (const auto& property : instance.properties()) {
-        appendProperty(out, property, options);
+        addProperty(out, property, options);
     }
-    out += "</INSTANCE>";
+    out.add("</INSTANCE>");
+}
+
+void appendInstance(std::string& out, const cim::Instance& instance,
+                    const InstanceOptions& options) {
+    Pieces pieces(out);
+    addInstance(pieces, instance, options);
+    pieces.flush();
 }
 
 } // namespace qelo::cimxml

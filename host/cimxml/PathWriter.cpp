@@ -22,20 +22,24 @@ std::string_view valueType(cim::Type type) {
 }
 
 // Key properties are scalars; anything else is shown as text rather than left out.
-void appendKeyValue(std::string& out, const cim::Value& value) {
+void addKeyValue(Pieces& out, const cim::Value& value) {
     if (value.type() == cim::Type::Reference && !value.isNull() && !value.isArray()) {
-        appendValue(out, value);
+        addValue(out, value);
         return;
     }
     const bool scalar = !value.isArray() && !value.isNull() && value.type() != cim::Type::Instance;
     const cim::Type type = scalar ? value.type() : cim::Type::String;
-    out += "<KEYVALUE VALUETYPE=\"";
-    out += valueType(type);
-    out += "\" TYPE=\"";
-    out += cim::typeName(type);
-    out += "\">";
-    appendText(out, value.toText());
-    out += "</KEYVALUE>";
+    out.add("<KEYVALUE VALUETYPE=\"");
+    out.add(valueType(type));
+    out.add("\" TYPE=\"");
+    out.add(cim::typeName(type));
+    out.add("\">");
+    if (scalar) {
+        addContent(out, value);
+    } else {
+        out.addText(value.toText());
+    }
+    out.add("</KEYVALUE>");
 }
 
 void appendClassName(std::string& out, std::string_view name) {
@@ -81,22 +85,28 @@ void appendLocalNameSpace(std::string& out, std::string_view nameSpace) {
     out += "</LOCALNAMESPACEPATH>";
 }
 
-void appendInstanceName(std::string& out, const cim::ObjectPath& path) {
-    out += "<INSTANCENAME CLASSNAME=\"";
-    appendAttributeText(out, path.className());
-    out += "\">";
+void addInstanceName(Pieces& out, const cim::ObjectPath& path) {
+    out.add("<INSTANCENAME CLASSNAME=\"");
+    out.addAttributeText(path.className());
+    out.add("\">");
     for (const auto& key : path.keys()) {
         if (key.name.empty()) {
-            appendKeyValue(out, key.value);
+            addKeyValue(out, key.value);
             continue;
         }
-        out += "<KEYBINDING NAME=\"";
-        appendAttributeText(out, key.name);
-        out += "\">";
-        appendKeyValue(out, key.value);
-        out += "</KEYBINDING>";
+        out.add("<KEYBINDING NAME=\"");
+        out.addAttributeText(key.name);
+        out.add("\">");
+        addKeyValue(out, key.value);
+        out.add("</KEYBINDING>");
     }
-    out += "</INSTANCENAME>";
+    out.add("</INSTANCENAME>");
+}
+
+void appendInstanceName(std::string& out, const cim::ObjectPath& path) {
+    Pieces pieces(out);
+    addInstanceName(pieces, path);
+    pieces.flush();
 }
 
 void appendInstancePath(std::string& out, const cim::ObjectPath& path, std::string_view host,

@@ -12,6 +12,16 @@ void appendClassName(std::string& out, std::string_view name) {
     out += "/>";
 }
 
+void appendNamedInstance(std::string& out, const cim::Instance& instance,
+                         const InstanceOptions& options) {
+    Pieces pieces(out);
+    pieces.add("<VALUE.NAMEDINSTANCE>");
+    addInstanceName(pieces, instance.path());
+    addInstance(pieces, instance, options);
+    pieces.add("</VALUE.NAMEDINSTANCE>");
+    pieces.flush();
+}
+
 void beginResponse(std::string& out, std::string_view messageId, bool extrinsic,
                    std::string_view method) {
     beginMessage(out, messageId);
@@ -57,10 +67,7 @@ void ResponseWriter::instance(std::string& out, const cim::Instance& instance, I
         appendInstance(out, instance, options);
         return;
     case InstanceForm::Named:
-        out += "<VALUE.NAMEDINSTANCE>";
-        appendInstanceName(out, instance.path());
-        appendInstance(out, instance, options);
-        out += "</VALUE.NAMEDINSTANCE>";
+        appendNamedInstance(out, instance, options);
         return;
     case InstanceForm::WithObjectPath:
         out += "<VALUE.OBJECTWITHPATH>";

@@ -5,63 +5,88 @@ namespace qelo::cimxml {
 namespace {
 
 struct ContentOf {
-    std::string& out;
+    Pieces& out;
     cim::Type type;
 
     void operator()(std::monostate) const {}
-    void operator()(bool value) const { out += value ? "true" : "false"; }
+    void operator()(bool value) const { out.add(value ? "true" : "false"); }
     void operator()(std::uint64_t value) const {
         if (type == cim::Type::Char16) {
-            appendText(out, cim::Value::unsignedInteger(type, value).toText());
+            out.addText(cim::Value::unsignedInteger(type, value).toText());
         } else {
-            appendNumber(out, value);
+            out.addNumber(value);
         }
     }
-    void operator()(std::int64_t value) const { appendNumber(out, value); }
-    void operator()(double value) const { out += cim::Value::real(type, value).toText(); }
-    void operator()(const std::string& value) const { appendText(out, value); }
-    void operator()(const cim::DateTime& value) const { out += value.text(); }
+    void operator()(std::int64_t value) const { out.addNumber(value); }
+    void operator()(double value) const { out.add(cim::Value::real(type, value).toText()); }
+    void operator()(const std::string& value) const { out.addText(value); }
+    void operator()(const cim::DateTime& value) const { out.add(value.text()); }
     void operator()(const std::shared_ptr<const cim::ObjectPath>& value) const {
-        appendPath(out, *value);
+        appendPath(out.flush(), *value);
     }
     void operator()(const std::shared_ptr<const cim::Instance>& value) const {
         std::string document;
         appendInstance(document, *value);
-        appendText(out, document);
+        out.addText(document);
     }
     void operator()(const cim::Value::Array& elements) const {
         for (const cim::Value& element : elements) {
             if (element.isNull()) {
-                out += "<VALUE.NULL/>";
+                out.add("<VALUE.NULL/>");
             } else {
-                appendValue(out, element);
+                addValue(out, element);
             }
         }
     }
 };
 
+struct Tags {
+    std::string_view begin;
+    std::string_view end;
+};
+
+Tags tagsOf(const cim::Value& value) {
+    if (value.type() == cim::Type::Reference) {
+        return value.isArray() ? Tags{"<VALUE.REFARRAY>", "</VALUE.REFARRAY>"}
+                               : Tags{"<VALUE.REFERENCE>", "</VALUE.REFERENCE>"};
+    }
+    return value.isArray() ? Tags{"<VALUE.ARRAY>", "</VALUE.ARRAY>"} : Tags{"<VALUE>", "</VALUE>"};
+}
+
 } // namespace
 
-void appendValue(std::string& out, const cim::Value& value) {
+void addContent(Pieces& out, const cim::Value& value) {
+    std::visit(ContentOf{out, value.type()}, value.data());
+}
+
+void addValue(Pieces& out, const cim::Value& value) {
     if (value.isNull()) {
         return;
     }
-    const bool reference = value.type() == cim::Type::Reference;
-    const std::string_view name = value.isArray() ? (reference ? "VALUE.REFARRAY>" : "VALUE.ARRAY>")
-                                                  : (reference ? "VALUE.REFERENCE>" : "VALUE>");
-    out += '<';
-    out += name;
-    std::visit(ContentOf{out, value.type()}, value.data());
-    out += "</";
-    out += name;
+    const Tags tags = tagsOf(value);
+    out.add(tags.begin);
+    addContent(out, value);
+    out.add(tags.end);
+}
+
+void appendValue(std::string& out, const cim::Value& value) {
+    Pieces pieces(out);
+    addValue(pieces, value);
+    pieces.flush();
+}
+
+void addType(Pieces& out, std::string_view attribute, cim::Type type) {
+    const bool embedded = type == cim::Type::Instance;
+    out.addAttribute(attribute, embedded ? "string" : cim::typeName(type));
+    if (embedded) {
+        out.add(" EmbeddedObject=\"instance\"");
+    }
 }
 
 void appendType(std::string& out, std::string_view attribute, cim::Type type) {
-    const bool embedded = type == cim::Type::Instance;
-    appendAttribute(out, attribute, embedded ? "string" : cim::typeName(type));
-    if (embedded) {
-        out += " EmbeddedObject=\"instance\"";
-    }
+    Pieces pieces(out);
+    addType(pieces, attribute, type);
+    pieces.flush();
 }
 
 void appendArgument(std::string& out, std::string_view name, const cim::Value& value, bool typed) {

@@ -1,6 +1,7 @@
 #include "XmlReader.h"
 
 #include <cim/ObjectPath.h>
+#include <secrecy/Forget.h>
 
 #include <algorithm>
 #include <expat.h>
@@ -22,6 +23,13 @@ constexpr std::size_t kMostAttributes = 64;
 std::string_view withoutPrefix(std::string_view name) {
     const std::size_t colon = name.rfind(':');
     return colon == std::string_view::npos ? name : name.substr(colon + 1);
+}
+
+// The parser keeps pieces of the document, which may hold a password.
+XML_Parser makeParser() {
+    static const XML_Memory_Handling_Suite memory = {secrecy::allocate, secrecy::reallocate,
+                                                     secrecy::release};
+    return XML_ParserCreate_MM("UTF-8", &memory, nullptr);
 }
 
 } // namespace
@@ -67,7 +75,7 @@ struct XmlReader::Handlers {
 };
 
 XmlReader::XmlReader(const XmlLimits& limits, Visitor visitor)
-    : limits_(limits), visitor_(std::move(visitor)), parser_(XML_ParserCreate("UTF-8")) {
+    : limits_(limits), visitor_(std::move(visitor)), parser_(makeParser()) {
     if (parser_ == nullptr) {
         throw std::bad_alloc();
     }

@@ -1,7 +1,6 @@
 #include "ResponseStream.h"
 
 #include <algorithm>
-#include <cstring>
 #include <utility>
 
 namespace qelo::server {
@@ -17,15 +16,16 @@ void ResponseStream::write(std::string_view bytes) {
         throw ResponseAbandoned("the client has gone");
     }
     // What goes to the file stays behind what is there already.
-    if (!file_.empty() || inMemory() >= limits_.memory) {
+    if (!file_.empty() || inMemory_ >= limits_.memory) {
         spill(lock, bytes);
     } else {
-        memory_.append(bytes);
+        memory_.emplace_back(bytes);
+        inMemory_ += bytes.size();
     }
-    if (inMemory() > limits_.head) {
+    if (inMemory_ > limits_.head) {
         announceHead(lock);
     }
-    wakeReader();
+    wakeReader(std::move(lock));
 }
 
 bool ResponseStream::restart() {
@@ -33,7 +33,7 @@ bool ResponseStream::restart() {
     if (headAnnounced_ || cancelled_) {
         return false;
     }
-    memory_.clear();
+    forgetMemory();
     return true;
 }
 
@@ -41,12 +41,12 @@ void ResponseStream::end(State state) {
     std::unique_lock<std::mutex> lock(mutex_);
     state_ = state;
     announceHead(lock);
-    wakeReader();
+    wakeReader(std::move(lock));
 }
 
 // Waits for a reader that keeps up; a slow one makes the caller go on to the file.
 void ResponseStream::makeRoom(std::unique_lock<std::mutex>& lock) {
-    while (!cancelled_ && file_.empty() && inMemory() >= limits_.memory) {
+    while (!cancelled_ && file_.empty() && inMemory_ >= limits_.memory) {
         if (!waitForReader(lock)) {
             return;
         }
@@ -81,19 +81,25 @@ void ResponseStream::announceHead(std::unique_lock<std::mutex>& lock) {
     lock.lock();
 }
 
-void ResponseStream::wakeReader() {
+// The reader may ask at once, and would wait for the lock.
+void ResponseStream::wakeReader(std::unique_lock<std::mutex> lock) {
     if (resume_) {
-        std::exchange(resume_, nullptr)();
+        const auto resume = std::exchange(resume_, nullptr);
+        lock.unlock();
+        resume();
     }
 }
 
 ssize_t ResponseStream::read(char* buffer, std::size_t size, const std::function<void()>& pause,
                              std::function<void()> resume) {
     const std::lock_guard<std::mutex> lock(mutex_);
-    ssize_t got = inMemory() > 0 ? takeFromMemory(buffer, size) : file_.take(buffer, size);
+    ssize_t got = inMemory_ > 0 ? takeFromMemory(buffer, size) : file_.take(buffer, size);
     if (got > 0) {
         delivered_ += static_cast<std::size_t>(got);
-        taken_.notify_one();
+        // A writer that goes on for every piece would be woken for every piece.
+        if (inMemory_ <= limits_.memory / 2) {
+            taken_.notify_one();
+        }
         return got;
     }
     if (got < 0 || state_ == State::Failed) {
@@ -108,15 +114,26 @@ ssize_t ResponseStream::read(char* buffer, std::size_t size, const std::function
 }
 
 ssize_t ResponseStream::takeFromMemory(char* buffer, std::size_t size) {
-    const std::size_t count = std::min(size, inMemory());
-    std::memcpy(buffer, memory_.data() + memoryAt_, count);
-    memoryAt_ += count;
-    // Moving what is left to the front pays once enough has been read.
-    if (memoryAt_ == memory_.size() || memoryAt_ >= limits_.head) {
-        memory_.erase(0, memoryAt_);
-        memoryAt_ = 0;
+    std::size_t taken = 0;
+    while (taken < size && !memory_.empty()) {
+        const std::string& first = memory_.front();
+        const std::size_t count = std::min(size - taken, first.size() - firstAt_);
+        first.copy(buffer + taken, count, firstAt_);
+        taken += count;
+        firstAt_ += count;
+        if (firstAt_ == first.size()) {
+            memory_.pop_front();
+            firstAt_ = 0;
+        }
     }
-    return static_cast<ssize_t>(count);
+    inMemory_ -= taken;
+    return static_cast<ssize_t>(taken);
+}
+
+void ResponseStream::forgetMemory() {
+    memory_.clear();
+    firstAt_ = 0;
+    inMemory_ = 0;
 }
 
 bool ResponseStream::isWhole() const {
@@ -126,9 +143,13 @@ bool ResponseStream::isWhole() const {
 
 std::string ResponseStream::takeAll() {
     const std::lock_guard<std::mutex> lock(mutex_);
-    memory_.erase(0, memoryAt_);
-    memoryAt_ = 0;
-    return std::exchange(memory_, std::string());
+    std::string all;
+    all.reserve(inMemory_);
+    for (const std::string& piece : memory_) {
+        all.append(piece, std::exchange(firstAt_, 0), std::string::npos);
+    }
+    forgetMemory();
+    return all;
 }
 
 void ResponseStream::cancel() {

@@ -1,4 +1,5 @@
 #include <cimxml/Characters.h>
+#include <cimxml/Pieces.h>
 
 #include <gtest/gtest.h>
 
@@ -47,11 +48,36 @@ TEST(Characters, What_xml_cannot_hold_is_replaced) {
     EXPECT_EQ(attribute("\x01"), replaced);
 }
 
-TEST(Characters, Numbers_of_any_size_are_written) {
+TEST(Pieces, Numbers_of_any_size_are_written) {
     std::string out;
-    appendNumber(out, std::uint64_t{18446744073709551615U});
-    appendNumber(out, std::int64_t{INT64_MIN});
-    EXPECT_EQ(out, "18446744073709551615-9223372036854775808");
+    Pieces pieces(out);
+    pieces.addNumber(std::uint64_t{18446744073709551615U});
+    pieces.addNumber(std::int64_t{INT64_MIN});
+    EXPECT_EQ(pieces.flush(), "18446744073709551615-9223372036854775808");
+}
+
+TEST(Pieces, Pieces_of_any_length_keep_their_order) {
+    std::string out = "-";
+    std::string expected = "-";
+    Pieces pieces(out);
+    for (const std::size_t length : {1U, 1000U, 30U, 1024U, 1025U, 5000U, 0U, 23U}) {
+        const std::string piece(length, static_cast<char>('a' + length % 26));
+        pieces.add(piece);
+        expected += piece;
+    }
+    pieces.flush();
+    EXPECT_EQ(out, expected);
+}
+
+TEST(Pieces, Text_is_escaped_between_other_pieces) {
+    std::string out;
+    Pieces pieces(out);
+    pieces.add("<a>");
+    pieces.addText("plain");
+    pieces.addText("1 < 2 \"\xC3\xA4\"");
+    pieces.addAttribute("n", "1 < 2 \"\t\"");
+    pieces.addAttributeText("plain");
+    EXPECT_EQ(pieces.flush(), "<a>plain1 &lt; 2 \"\xC3\xA4\" n=\"1 &lt; 2 &quot;&#9;&quot;\"plain");
 }
 
 } // namespace

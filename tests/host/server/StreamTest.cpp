@@ -253,4 +253,37 @@ TEST(ResponseStream, A_failed_answer_ends_as_broken_after_what_was_written) {
     EXPECT_EQ(reader.ended(), ResponseStream::broken);
 }
 
+TEST(ResponseStream, A_reader_may_read_as_soon_as_it_is_woken) {
+    SpaceBudget space(kPlenty);
+    ResponseStream stream(space, smallLimits(), [] {});
+    char buffer[100];
+    ssize_t got = 0;
+    const auto readAgain = [&] {
+        got = stream.read(
+            buffer, sizeof buffer, [] {}, [] {});
+    };
+    ASSERT_EQ(stream.read(
+                  buffer, sizeof buffer, [] {}, readAgain),
+              0);
+    stream.write("text");
+    EXPECT_EQ(got, 4);
+}
+
+TEST(ResponseStream, A_writer_that_waits_goes_on_once_half_has_been_read) {
+    SpaceBudget space(kPlenty);
+    ResponseStream::Limits limits = smallLimits();
+    limits.patience = 600s;
+    ResponseStream stream(space, limits, [] {});
+    stream.write(pattern(0, 4000));
+    std::thread writer([&] {
+        stream.write(pattern(4000, 1000));
+        stream.finish();
+    });
+    Reader reader(stream);
+    std::string all = reader.read(2000);
+    writer.join(); // hangs if nothing wakes it
+    all += reader.read();
+    EXPECT_EQ(all, pattern(0, 5000));
+}
+
 } // namespace

@@ -77,7 +77,16 @@ void LocalConnection::referenceNames(const cim::ObjectPath& path,
 client::MethodResult LocalConnection::invokeMethod(const cim::ObjectPath& path,
                                                    const std::string& method,
                                                    const client::Arguments& in) {
-    return router_->invokeMethod(context_, declared(path), method, in);
+    if (!repository_) {
+        return router_->invokeMethod(context_, path, method, in);
+    }
+    std::vector<schema::UntypedArgument> given;
+    for (const auto& [name, value] : in) {
+        given.push_back({name, value, true});
+    }
+    const schema::DeclaredCall call =
+        schema::declaredCall(*repository_, path.nameSpace(), path.className(), method, given);
+    return router_->invokeMethod(context_, declared(path), call.method, call.arguments);
 }
 
 cim::Class LocalConnection::getClass(const cim::ObjectPath& classPath) {

@@ -66,6 +66,7 @@ void tellNameSpace(ProviderCall& call, const std::string& nameSpace) {
 const char* providerTypeName(ProviderType type) {
     static constexpr std::array<const char*, providerTypeCount> names = {
         "Instance", "Association", "Method", "Property", "Indication"};
+    // cppcheck-suppress CastIntegerToAddressAtReturn
     return names[indexOf(type)];
 }
 

@@ -21,6 +21,7 @@ struct Refusal {
 // unwinds through the handler with something that is no C++ exception and must go on.
 inline void passForcedUnwind() {
     if (!abi::__cxa_current_exception_type()) {
+        // cppcheck-suppress rethrowNoCurrentException
         throw;
     }
 }

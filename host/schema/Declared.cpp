@@ -13,6 +13,7 @@ using cim::Type;
 using cim::Value;
 
 constexpr unsigned int kInvalidParameter = 4;
+constexpr unsigned int kMethodNotFound = 17;
 constexpr int kDeepestReference = 16;
 
 [[noreturn]] void refuse(const std::string& text) {
@@ -198,29 +199,50 @@ const cim::ParameterDeclaration* findParameter(const cim::MethodDeclaration& met
     return nullptr;
 }
 
+client::Arguments asGiven(const std::vector<UntypedArgument>& arguments) {
+    client::Arguments result;
+    result.reserve(arguments.size());
+    for (const UntypedArgument& argument : arguments) {
+        result.emplace_back(argument.name, argument.value);
+    }
+    return result;
+}
+
+client::Arguments declaredArguments(const Typing& typing, const cim::MethodDeclaration& method,
+                                    const std::vector<UntypedArgument>& arguments) {
+    client::Arguments result;
+    result.reserve(arguments.size());
+    for (const UntypedArgument& argument : arguments) {
+        const cim::ParameterDeclaration* parameter = findParameter(method, argument.name);
+        if (parameter == nullptr) {
+            refuse("the method " + method.name + " has no argument \"" + argument.name + "\"");
+        }
+        cim::Value value = argumentValue(typing, argument, *parameter);
+        if (!value.isNull()) {
+            result.emplace_back(parameter->name, std::move(value));
+        }
+    }
+    return result;
+}
+
 } // namespace
 
 cim::ObjectPath withDeclaredKeys(const ClassRepository& repository, const cim::ObjectPath& path) {
     return Typing(repository, path.nameSpace()).path(path, 0);
 }
 
-client::Arguments withDeclaredArguments(const ClassRepository& repository,
-                                        const std::string& nameSpace, const std::string& className,
-                                        const std::string& method,
-                                        const std::vector<UntypedArgument>& arguments) {
+DeclaredCall declaredCall(const ClassRepository& repository, const std::string& nameSpace,
+                          const std::string& className, const std::string& method,
+                          const std::vector<UntypedArgument>& arguments) {
     const cim::Class* known = repository.find(nameSpace, className);
-    const cim::MethodDeclaration* declared = known == nullptr ? nullptr : known->method(method);
-    const Typing typing(repository, nameSpace);
-    client::Arguments result;
-    result.reserve(arguments.size());
-    for (const UntypedArgument& argument : arguments) {
-        const cim::ParameterDeclaration* parameter =
-            declared == nullptr ? nullptr : findParameter(*declared, argument.name);
-        result.emplace_back(argument.name, parameter == nullptr
-                                               ? argument.value
-                                               : argumentValue(typing, argument, *parameter));
+    if (known == nullptr) {
+        return {method, asGiven(arguments)};
     }
-    return result;
+    const cim::MethodDeclaration* declared = known->method(method);
+    if (declared == nullptr) {
+        throw client::CimError(kMethodNotFound, known->name + " has no method \"" + method + "\"");
+    }
+    return {declared->name, declaredArguments(Typing(repository, nameSpace), *declared, arguments)};
 }
 
 } // namespace qelo::schema

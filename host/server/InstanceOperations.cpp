@@ -188,10 +188,10 @@ void callMethod(const OperationCall& call) {
     for (const cimxml::ExtrinsicParameter& parameter : call.request.extrinsicParameters) {
         given.push_back({parameter.name, parameter.value, parameter.typed});
     }
-    const client::Arguments arguments = schema::withDeclaredArguments(
+    const schema::DeclaredCall declared = schema::declaredCall(
         call.repository(), call.nameSpace(), path.className(), call.request.method, given);
     const client::MethodResult result =
-        call.router().invokeMethod(call.context, path, call.request.method, arguments);
+        call.router().invokeMethod(call.context, path, declared.method, declared.arguments);
     call.answer.writer().methodResult(call.answer.text(), result);
     call.answer.send();
 }

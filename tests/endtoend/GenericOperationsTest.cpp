@@ -86,9 +86,9 @@ TEST_F(GenericOperations, An_unknown_method_fails_and_changes_nothing) {
     const auto before = json({"accounts"});
     const Finished finished =
         run({"cm", pathOf("ZANTH_Account", "alice"), "NoSuchMethod", "Name=mallory"});
-    EXPECT_EQ(finished.status, 1);
+    EXPECT_EQ(finished.status, 17);
     EXPECT_EQ(finished.out, "");
-    EXPECT_NE(finished.err.find("Execute Method Failed"), std::string::npos);
+    EXPECT_NE(finished.err.find("ZANTH_Account has no method \"NoSuchMethod\""), std::string::npos);
     EXPECT_EQ(json({"accounts"}), before);
 }
 

@@ -267,7 +267,9 @@ TEST_F(UserLife, Methods_can_be_called_under_their_own_names) {
         run({"cm", "ZANTH_Account", "CreateUser", "Name=carol", "UserID:uint32=4242"});
     EXPECT_EQ(created.status, 0) << created.err;
     EXPECT_EQ(field("passwd", "carol", 2), "4242");
-    EXPECT_EQ(run({"cm", "ZANTH_Account", "CreateUser", "Name=dave", "Surprise=1"}).status, 1);
+    EXPECT_EQ(run({"cm", "ZANTH_Account", "CreateUser", "Name=dave", "Surprise=1"}).status, 4);
+    EXPECT_EQ(run({"cm", "zanth_account", "createuser", "NAME=erin"}).status, 0);
+    EXPECT_NE(entry("passwd", "erin"), "");
     EXPECT_EQ(entry("passwd", "dave"), "");
     EXPECT_EQ(run({"cm", "ZANTH_Group", "CreateGroup", "Name=crew"}).status, 0);
     EXPECT_NE(entry("group", "crew"), "");

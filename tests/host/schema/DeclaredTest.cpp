@@ -8,6 +8,7 @@ namespace {
 using cim::Type;
 using cim::Value;
 using ::testing::HasSubstr;
+using ::testing::SizeIs;
 
 class DeclaredTest : public SchemaTest {
 protected:
@@ -40,7 +41,7 @@ protected:
     }
     std::string argumentRefusal(UntypedArgument argument) {
         try {
-            withDeclaredArguments(repository, nameSpace, "Thing", "Do", {std::move(argument)});
+            declaredCall(repository, nameSpace, "Thing", "Do", {std::move(argument)});
         } catch (const client::CimError& error) {
             EXPECT_EQ(error.code(), 4U);
             return error.what();
@@ -48,9 +49,8 @@ protected:
         return {};
     }
     Value argument(const std::string& name, Value value, bool typed = false) {
-        return withDeclaredArguments(repository, nameSpace, "thing", "do",
-                                     {{name, std::move(value), typed}})
-            .at(0)
+        return declaredCall(repository, nameSpace, "thing", "do", {{name, std::move(value), typed}})
+            .arguments.at(0)
             .second;
     }
 };
@@ -113,8 +113,6 @@ TEST_F(DeclaredTest, Untyped_arguments_are_read_in_the_declared_type) {
                                                      Value::null(Type::String)}));
     EXPECT_EQ(when.type(), Type::DateTime);
     EXPECT_EQ(when.asArray().size(), 2U);
-    EXPECT_EQ(argument("When", Value::null(Type::String, true)).type(), Type::DateTime);
-    EXPECT_EQ(argument("Count", Value::null(Type::String)), Value::null(Type::UInt8));
     EXPECT_EQ(argument("Other", Value::string("Thing.Id=1")).asReference().key("Id")->type(),
               Type::UInt16);
 }
@@ -128,14 +126,45 @@ TEST_F(DeclaredTest, Arguments_that_do_not_fit_are_refused) {
                 HasSubstr("must not be an array"));
 }
 
-TEST_F(DeclaredTest, What_is_not_declared_is_left_as_it_is) {
-    EXPECT_EQ(argument("Unknown", Value::string("7")), Value::string("7"));
-    const auto other = withDeclaredArguments(repository, nameSpace, "Thing", "Undo",
-                                             {{"Count", Value::string("x"), false}});
-    EXPECT_EQ(other.at(0).second, Value::string("x"));
-    const auto unknown = withDeclaredArguments(repository, nameSpace, "None", "Do",
-                                               {{"Count", Value::string("x"), false}});
-    EXPECT_EQ(unknown.at(0).first, "Count");
+TEST_F(DeclaredTest, A_call_gets_the_names_that_the_class_declares) {
+    const DeclaredCall call =
+        declaredCall(repository, nameSpace, "THING", "dO", {{"cOUNT", Value::string("7"), false}});
+    EXPECT_EQ(call.method, "Do");
+    ASSERT_THAT(call.arguments, SizeIs(1));
+    EXPECT_EQ(call.arguments[0].first, "Count");
+}
+
+TEST_F(DeclaredTest, An_argument_without_a_value_is_not_given) {
+    const DeclaredCall call = declaredCall(repository, nameSpace, "Thing", "Do",
+                                           {{"Count", Value::null(Type::UInt8), true},
+                                            {"Text", Value::null(Type::String), false},
+                                            {"Text", Value::string(""), false}});
+    ASSERT_THAT(call.arguments, SizeIs(1));
+    EXPECT_EQ(call.arguments[0].second, Value::string(""));
+}
+
+TEST_F(DeclaredTest, An_argument_that_the_method_has_not_is_refused) {
+    EXPECT_EQ(argumentRefusal({"Unknown", Value::string("7"), false}),
+              "the method Do has no argument \"Unknown\"");
+}
+
+TEST_F(DeclaredTest, A_method_that_the_class_has_not_is_not_found) {
+    try {
+        declaredCall(repository, nameSpace, "thing", "Undo", {});
+        ADD_FAILURE() << "nothing was thrown";
+    } catch (const client::CimError& error) {
+        EXPECT_EQ(error.code(), 17U);
+        EXPECT_STREQ(error.what(), "Thing has no method \"Undo\"");
+    }
+}
+
+TEST_F(DeclaredTest, A_call_of_an_unknown_class_is_left_as_it_is) {
+    const DeclaredCall call = declaredCall(
+        repository, nameSpace, "None", "do",
+        {{"Count", Value::string("x"), false}, {"Nothing", Value::null(Type::String), false}});
+    EXPECT_EQ(call.method, "do");
+    ASSERT_THAT(call.arguments, SizeIs(2));
+    EXPECT_EQ(call.arguments[0].second, Value::string("x"));
 }
 
 } // namespace

@@ -53,17 +53,18 @@ function ratio(name, base, what, accounts, of, most,    times) {
         sprintf("at most %s x %s", most, of), told(times <= most))
 }
 # All accounts have to be read before the first is named.
-function namesRatio(which, label, n) {
+function namesRatio(which, label, n,    base) {
     if (!(("readStore/" which) in time) || !(("namesFloor/" n) in time)) return
-    time["readAndName/" which] = time["readStore/" which] + time["namesFloor/" n]
-    ratio("names/" which, "readAndName/" which,
-        "EnumInstanceNames, " label ", " n " accounts", n, "reading + floor", 1.5)
+    base = time["readStore/" which] + time["namesFloor/" n]
+    row("EnumInstanceNames, " label ", " n " accounts",
+        sprintf("%s = %.2f x", perAccount("names/" which, n), time["names/" which] / base),
+        "(of reading + floor)", "")
 }
-function growth(name, what, scaled,    grown) {
+function growth(name, what, scaled, most,    grown) {
     if (!((name "/60000") in time) || !((name "/1000") in time)) return
     grown = time[name "/60000"] / scaled / time[name "/1000"]
     row("growth from 1000 to 60000 accounts, " what, sprintf("%.2f x", grown),
-        "at most 1.15 x", told(grown <= 1.15))
+        most ? "at most " most " x" : "", most ? told(grown <= most) : "")
 }
 function memory(name) {
     if (name in peak)
@@ -92,13 +93,18 @@ function providerTable(    i, f, n, label) {
             namesRatio(forms[f] "/" n, labels[f], n)
     }
     for (f = 1; f in forms; f++) {
-        growth("enumerate/" forms[f], labels[f], 60)
-        growth("names/" forms[f], "names, " labels[f], 60)
+        growth("enumerate/" forms[f], labels[f], 60, 1.15)
+        growth("names/" forms[f], "names, " labels[f], 60, 0)
         ratio("getOne/" forms[f] "/60000", "readStore/" forms[f] "/60000",
             "GetInstance among 60000, " labels[f], 60000, "reading", 1.2)
     }
     ratio("enumerateTraced/1000", "enumerate/node_file/1000",
         "EnumInstances, all traced to a file", 1000, "untraced", 8)
+    if ("enumerateTracedAtOnce/1000" in time)
+        row("  each line written at once",
+            sprintf("%s = %.2f x", perAccount("enumerateTracedAtOnce/1000", 1000),
+                time["enumerateTracedAtOnce/1000"] / time["enumerate/node_file/1000"]),
+            "", "")
 }
 function methodTable(    i, f, n, name) {
     if (!("methodFloor/1" in time)) return
@@ -112,7 +118,7 @@ function methodTable(    i, f, n, name) {
                     sprintf("%.2f us = %.2f x", time[name] / 1000,
                         time[name] / time["methodFloor/1"]), "", "")
         }
-    for (f = 1; f in forms; f++) growth("method/" forms[f], labels[f], 1)
+    for (f = 1; f in forms; f++) growth("method/" forms[f], labels[f], 1, 0)
 }
 
 # --- The server ------------------------------------------------------------------------------

@@ -39,8 +39,9 @@ Logging::~Logging() {
     std::filesystem::remove_all(path_, ignored);
 }
 
-void Logging::traceEverything(bool on) {
-    write(on ? "trace = file:" + (path_ / "trace").string() + "\ntrace.level = 0\n" : "");
+void Logging::traceEverything(bool on, bool atOnce) {
+    const std::string place = "trace = file:" + (path_ / "trace").string() + "\ntrace.level = 0\n";
+    write(on ? place + (atOnce ? "trace.buffer = off\n" : "") : "");
     letTheLoggerLook();
     std::error_code ignored;
     if (!on) {

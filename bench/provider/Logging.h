@@ -14,9 +14,9 @@ public:
     Logging(const Logging&) = delete;
     Logging& operator=(const Logging&) = delete;
 
-    // Traces every line to a file from now on, or nothing again. Waits until the logger has
-    // seen the change.
-    void traceEverything(bool on);
+    // Traces every line to a file from now on, each at once or several together, or nothing
+    // again. Waits until the logger has seen the change.
+    void traceEverything(bool on, bool atOnce);
 
 private:
     void write(const std::string& text) const;

@@ -4,6 +4,7 @@
 //               store, no trace
 //   enumerate   EnumInstances of the provider, from a node file and from account files
 //   enumerateTraced   the same with every line traced to a file
+//   enumerateTracedAtOnce   the same with each line written by itself
 //   readStore   the provider's reading of all accounts into records, and nothing else
 //   getOne      GetInstance of one account among all, which reads them all
 //   names, namesFloor    EnumInstanceNames, and its floor (NamesBench.cpp)
@@ -81,10 +82,10 @@ void enumerateAccounts(benchmark::State& state, Form form) {
     measure(state, [&] { benchmark::DoNotOptimize(enumerate(connection, accountClass)); });
 }
 
-void enumerateTraced(benchmark::State& state) {
-    logging->traceEverything(true);
+void enumerateTraced(benchmark::State& state, bool atOnce) {
+    logging->traceEverything(true, atOnce);
     enumerateAccounts(state, Form::nodeFile);
-    logging->traceEverything(false);
+    logging->traceEverything(false, false);
 }
 
 void readStore(benchmark::State& state, Form form) {
@@ -127,7 +128,14 @@ BENCHMARK_CAPTURE(getOne, account_files, Form::accountFiles)
     ->Name("getOne/account_files")
     ->Arg(60000)
     ->Unit(benchmark::kMillisecond);
-BENCHMARK(enumerateTraced)->Arg(1000)->Unit(benchmark::kMillisecond);
+BENCHMARK_CAPTURE(enumerateTraced, gathered, false)
+    ->Name("enumerateTraced")
+    ->Arg(1000)
+    ->Unit(benchmark::kMillisecond);
+BENCHMARK_CAPTURE(enumerateTraced, atOnce, true)
+    ->Name("enumerateTracedAtOnce")
+    ->Arg(1000)
+    ->Unit(benchmark::kMillisecond);
 
 } // namespace
 

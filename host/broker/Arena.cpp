@@ -4,6 +4,7 @@
 
 #include <algorithm>
 #include <memory>
+#include <utility>
 
 #include <sys/mman.h>
 
@@ -12,6 +13,10 @@ namespace {
 
 constexpr std::size_t alignment = alignof(std::max_align_t);
 constexpr std::size_t largestGrowth = 4UL * 1024 * 1024;
+constexpr std::size_t largestKept = 256UL * 1024;
+
+// A provider that makes up ever new names must not fill the memory of a whole call with them.
+constexpr std::size_t mostSharedNames = 4096;
 
 std::size_t roundUp(std::size_t size) {
     if (size > SIZE_MAX - alignment) {
@@ -34,14 +39,30 @@ void preferLargePages(void* memory, std::size_t size) {
 
 struct alignas(std::max_align_t) Arena::Block {
     Block* next;
+    std::size_t room; // behind this header
+
+    std::byte* begin() { return reinterpret_cast<std::byte*>(this + 1); }
 };
 
-Arena::~Arena() {
-    while (blocks_) {
-        Block* next = blocks_->next;
-        ::operator delete(blocks_);
-        blocks_ = next;
+Arena::~Arena() { freeBlocks(blocks_); }
+
+void Arena::freeBlocks(Block* first) {
+    while (first != nullptr) {
+        Block* next = first->next;
+        ::operator delete(first);
+        first = next;
     }
+}
+
+void Arena::clear() {
+    names_.clear();
+    recent_ = {};
+    // The latest block is the largest: a level that is opened again and again soon needs no other.
+    Block* kept = blocks_ != nullptr && blocks_->room <= largestKept ? blocks_ : nullptr;
+    freeBlocks(kept != nullptr ? std::exchange(kept->next, nullptr) : blocks_);
+    blocks_ = kept;
+    free_ = kept != nullptr ? kept->begin() : nullptr;
+    end_ = kept != nullptr ? free_ + kept->room : nullptr;
 }
 
 void* Arena::allocate(std::size_t size) {
@@ -62,20 +83,35 @@ void Arena::addBlock(std::size_t size) {
     }
     void* memory = ::operator new(sizeof(Block) + room);
     preferLargePages(memory, sizeof(Block) + room);
-    blocks_ = new (memory) Block{blocks_};
-    free_ = static_cast<std::byte*>(memory) + sizeof(Block);
+    blocks_ = new (memory) Block{blocks_, room};
+    free_ = blocks_->begin();
     end_ = free_ + room;
     nextBlock_ = std::min(largestGrowth, nextBlock_ * 2);
 }
 
 StringObject* Arena::name(std::string_view text, std::uint32_t hash) {
+    if (elder_ != nullptr) {
+        return elder_->nameFor(*this, text, hash);
+    }
+    return nameFor(*this, text, hash);
+}
+
+// The name from the table, which is made in here; where that is full, one made in `user`.
+StringObject* Arena::nameFor(Arena& user, std::string_view text, std::uint32_t hash) {
     std::lock_guard lock(namesMutex_);
-    if (auto found = names_.find(NameKey{text, hash}); found != names_.end()) {
-        return found->second;
+    StringObject*& recent = recent_[hash % recentNames];
+    if (recent != nullptr && recent->view() == text) {
+        return recent;
+    }
+    if (const auto found = names_.find(NameKey{text, hash}); found != names_.end()) {
+        return recent = found->second;
+    }
+    if (&user != this && names_.size() >= mostSharedNames) {
+        return newString(user, text, Ownership::Contained);
     }
     StringObject* made = newString(*this, text, Ownership::Contained);
-    names_.emplace(NameKey{std::string_view(made->text(), made->length), hash}, made);
-    return made;
+    names_.emplace(NameKey{made->view(), hash}, made);
+    return recent = made;
 }
 
 } // namespace qelo::broker

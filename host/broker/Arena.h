@@ -6,6 +6,7 @@
 // a provider may hand objects of one call to helper threads of its own.
 #pragma once
 
+#include <array>
 #include <atomic>
 #include <cstddef>
 #include <cstdint>
@@ -24,9 +25,15 @@ class Arena {
 public:
     // `firstBlock` bytes are fetched at the first allocation; later blocks grow.
     explicit Arena(std::size_t firstBlock = 4096) : nextBlock_(firstBlock) {}
+
+    // One whose names are those of `elder`, which lives longer and is told of the same calls.
+    explicit Arena(Arena* elder) : Arena() { elder_ = elder; }
     ~Arena();
     Arena(const Arena&) = delete;
     Arena& operator=(const Arena&) = delete;
+
+    // Ends all objects, but keeps a block for the next ones. Nobody may use it meanwhile.
+    void clear();
 
     // Uninitialised memory for any type; never null. Throws std::bad_alloc.
     void* allocate(std::size_t size);
@@ -52,9 +59,13 @@ public:
     // The most properties that an instance here had so far: the next one is likely to be of
     // the same class and gets room for as many at once.
     std::size_t usualPropertyCount() const {
-        return propertyCount_.load(std::memory_order_relaxed);
+        return (elder_ != nullptr ? elder_ : this)->propertyCount_.load(std::memory_order_relaxed);
     }
     void notePropertyCount(std::size_t count) {
+        if (elder_ != nullptr) {
+            elder_->notePropertyCount(count);
+            return;
+        }
         constexpr std::size_t unusual = 64;
         if (count > usualPropertyCount() && count <= unusual) {
             propertyCount_.store(count, std::memory_order_relaxed);
@@ -72,8 +83,14 @@ private:
         std::size_t operator()(const NameKey& key) const { return key.hash; }
     };
 
-    void addBlock(std::size_t size);
+    // Where a name was found last; most providers use the same few all the time.
+    static constexpr std::size_t recentNames = 64;
 
+    void addBlock(std::size_t size);
+    static void freeBlocks(Block* first);
+    StringObject* nameFor(Arena& user, std::string_view text, std::uint32_t hash);
+
+    Arena* elder_ = nullptr;
     std::mutex mutex_;
     Block* blocks_ = nullptr;
     std::byte* free_ = nullptr;
@@ -84,6 +101,7 @@ private:
 
     std::mutex namesMutex_;
     std::unordered_map<NameKey, StringObject*, NameKeyHash> names_;
+    std::array<StringObject*, recentNames> recent_{}; // by hash
 };
 
 // A growing sequence whose elements lie in an arena. Copying copies the reference only.

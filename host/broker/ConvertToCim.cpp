@@ -138,6 +138,7 @@ cim::ObjectPath toCim(const ObjectPathObject& path, int depth) {
     checkDepth(depth);
     cim::ObjectPath out(textOf(*path.nameSpace), textOf(*path.className));
     out.setHost(textOf(*path.host));
+    out.reserveKeys(path.keys.size());
     for (const Entry& key : path.keys) {
         out.setKey(key.name->view(), toCim(key.data, depth));
     }

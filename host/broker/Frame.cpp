@@ -37,7 +37,8 @@ Frame::~Frame() {
 }
 
 const Arena* Frame::mark() {
-    levels_.push_back(std::make_unique<Arena>());
+    levels_.reserve(levels_.size() + 1);
+    levels_.push_back(spare_ ? std::move(spare_) : std::make_unique<Arena>(levels_.front().get()));
     return levels_.back().get();
 }
 
@@ -49,7 +50,9 @@ Frame::ReleaseResult Frame::release(const void* level) {
         if (i != levels_.size()) {
             return ReleaseResult::NotInnermost;
         }
+        spare_ = std::move(levels_.back());
         levels_.pop_back();
+        spare_->clear();
         return ReleaseResult::Released;
     }
     return ReleaseResult::Unknown;

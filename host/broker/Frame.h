@@ -42,6 +42,7 @@ private:
     Kind kind_;
     Frame* below_;
     std::vector<std::unique_ptr<Arena>> levels_; // never empty
+    std::unique_ptr<Arena> spare_;               // a released level, for the next one
 };
 
 // The current frame of this thread. Throws std::bad_alloc when the thread is ending.

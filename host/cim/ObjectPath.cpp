@@ -40,9 +40,10 @@ void appendKeyValue(std::string& text, const Value& value) {
 } // namespace
 
 bool sameName(std::string_view left, std::string_view right) {
+    // Nearly always they are spelled alike.
     return left.size() == right.size() &&
-           std::equal(left.begin(), left.end(), right.begin(),
-                      [](char a, char b) { return toLower(a) == toLower(b); });
+           (left == right || std::equal(left.begin(), left.end(), right.begin(),
+                                        [](char a, char b) { return toLower(a) == toLower(b); }));
 }
 
 void ObjectPath::setKey(std::string_view name, Value value) {

@@ -36,6 +36,7 @@ public:
     void setClassName(std::string className) { className_ = std::move(className); }
     void setKey(std::string_view name, Value value); // adds, or replaces under the same name
     void clearKeys() { keys_.clear(); }
+    void reserveKeys(std::size_t count) { keys_.reserve(count); }
 
     // The key of that name, or null.
     const Value* key(std::string_view name) const;

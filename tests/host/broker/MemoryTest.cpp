@@ -34,6 +34,41 @@ TEST_F(MemoryTest, Objects_made_before_a_mark_survive_its_release) {
     EXPECT_EQ(text(before->ft->getProperty(before, "P", nullptr).value.string), "inner");
 }
 
+TEST_F(MemoryTest, Levels_that_follow_each_other_do_not_disturb_each_other) {
+    for (int level = 0; level < 1000; ++level) {
+        CMPIGcStat* mark = mft().mark(mb(), nullptr);
+        CMPIInstance* made = instance();
+        const std::string expected = std::to_string(level);
+        for (const char* name : {"P", "Q", "p2"}) {
+            const CMPIString* value = string(expected.c_str());
+            made->ft->setProperty(made, name, reinterpret_cast<const CMPIValue*>(&value),
+                                  CMPI_string);
+        }
+        EXPECT_EQ(made->ft->getPropertyCount(made, nullptr), 3U);
+        EXPECT_EQ(text(made->ft->getProperty(made, "p2", nullptr).value.string), expected);
+        ASSERT_EQ(mft().release(mb(), mark).rc, CMPI_RC_OK);
+    }
+}
+
+TEST_F(MemoryTest, Names_without_end_are_kept_apart_and_end_with_their_level) {
+    constexpr int levels = 300;
+    constexpr int names = 50;
+    for (int level = 0; level < levels; ++level) {
+        CMPIGcStat* mark = mft().mark(mb(), nullptr);
+        CMPIInstance* made = instance();
+        for (int name = 0; name < names; ++name) {
+            const std::string spelled = "P" + std::to_string(level * names + name);
+            const CMPIUint32 value = static_cast<CMPIUint32>(name);
+            made->ft->setProperty(made, spelled.c_str(), reinterpret_cast<const CMPIValue*>(&value),
+                                  CMPI_uint32);
+            CMPIString* given = nullptr;
+            made->ft->getPropertyAt(made, static_cast<CMPICount>(name), &given, nullptr);
+            ASSERT_EQ(text(given), spelled);
+        }
+        ASSERT_EQ(mft().release(mb(), mark).rc, CMPI_RC_OK);
+    }
+}
+
 TEST_F(MemoryTest, A_clone_made_inside_a_mark_survives_its_release) {
     CMPIGcStat* mark = mft().mark(mb(), nullptr);
     CMPIString* inner = string("inner");

@@ -11,10 +11,17 @@ namespace qelo::test {
 namespace {
 
 std::size_t allFaults = 0;
+std::size_t allOperations = 0; // of the parts without faults
 
 class Summary : public testing::Environment {
 public:
-    void TearDown() override { std::cout << "[  SWEEP   ] " << allFaults << " faults in all\n"; }
+    void TearDown() override {
+        if (allOperations != 0) {
+            std::cout << "[  SWEEP   ] " << allOperations << " operations in all\n";
+        } else {
+            std::cout << "[  SWEEP   ] " << allFaults << " faults in all\n";
+        }
+    }
 };
 
 const testing::Environment* const summary = testing::AddGlobalTestEnvironment(new Summary);
@@ -32,6 +39,12 @@ void countFaults(const std::string& part, std::size_t operations, std::size_t fa
     testing::Test::RecordProperty("faults", std::to_string(faults));
     std::cout << "[  SWEEP   ] " << part << ": " << faults << " faults in " << operations
               << " operations\n";
+}
+
+void countOperations(const std::string& part, std::size_t operations) {
+    allOperations += operations;
+    testing::Test::RecordProperty("operations", std::to_string(operations));
+    std::cout << "[  SWEEP   ] " << part << ": " << operations << " operations\n";
 }
 
 } // namespace qelo::test

@@ -14,4 +14,7 @@ bool isLongSweep();
 // one that calls nothing outside it: the caller checks that.
 void countFaults(const std::string& part, std::size_t operations, std::size_t faults);
 
+// The same for a part in which nothing is made to fail, and many operations run at once.
+void countOperations(const std::string& part, std::size_t operations);
+
 } // namespace qelo::test

@@ -15,6 +15,7 @@ namespace qelo::cli {
 namespace {
 
 constexpr char kProgram[] = "qelosim";
+constexpr char kPasswordOption[] = "--password-stdin";
 
 constexpr char kFooter[] =
     "A path is written as ein prints it: ZANTH_Group.CreationClassName=\"ZANTH_Group\","
@@ -79,11 +80,33 @@ std::string helpOf(const CLI::App& app) {
     return chosen.empty() ? app.help() : chosen.front()->help(kProgram);
 }
 
+bool readsPassword(const CLI::App& command) {
+    return command.get_option_no_throw(kPasswordOption) != nullptr;
+}
+
+// Whoever forgets how to give a password may have given it in any of these words: no more is told
+// of them than the names of options.
+std::string describeSuperfluous(const std::vector<std::string>& words) {
+    std::string text = "a password is not given as an argument, and what was given is not expected";
+    for (const std::string& word : words) {
+        text += word[0] == '-' ? ": " + word.substr(0, word.find('=')) : "";
+    }
+    return text;
+}
+
 // What the parser objects to. It takes an unknown command for a superfluous argument.
 std::string describe(const CLI::App& app, const CLI::ParseError& error) {
     const auto superfluous = app.remaining();
     if (app.get_subcommands().empty() && !superfluous.empty() && superfluous[0][0] != '-') {
         return "no such command: \"" + superfluous[0] + "\"";
+    }
+    const auto chosen = app.get_subcommands();
+    if (!chosen.empty() && readsPassword(*chosen.front())) {
+        const auto words = app.remaining(true);
+        if (!words.empty() ||
+            std::string(error.what()).find(kPasswordOption) != std::string::npos) {
+            return describeSuperfluous(words);
+        }
     }
     return error.what();
 }

@@ -30,33 +30,41 @@ cim::ObjectPath withReferences(const cim::ObjectPath& path, const Options& optio
     return result;
 }
 
-cim::Value argumentValue(const std::string& whole, const std::string& typeName,
-                         const std::string& text) {
+// An argument of a method as errors show it: passwords without their value.
+std::string shown(const std::string& name, const std::string& whole) {
+    return "argument " + (cim::sameName(name, "UserPassword") ? name : inQuotes(whole));
+}
+
+cim::Value argumentValue(const std::string& name, const std::string& whole,
+                         const std::string& typeName, const std::string& text) {
     const auto type = cim::typeOfName(typeName);
     if (!type) {
-        throw UsageError("argument " + inQuotes(whole) + ": no such type: " + inQuotes(typeName));
+        throw UsageError(shown(name, whole) + ": no such type: " + inQuotes(typeName));
     }
     std::string error;
     const auto value = cim::parseValue(*type, text, error);
     if (!value) {
-        throw UsageError("argument " + inQuotes(whole) + ": " + error);
+        throw UsageError(shown(name, whole) + ": " + error);
     }
     return *value;
 }
 
-std::pair<std::string, cim::Value> argumentOf(const std::string& text) {
+// `number`: where it stands, for people.
+std::pair<std::string, cim::Value> argumentOf(const std::string& text, std::size_t number) {
     const std::size_t equals = text.find('=');
     if (equals == std::string::npos) {
-        throw UsageError("argument " + inQuotes(text) + ": name=value is expected");
+        throw UsageError("argument " + std::to_string(number) +
+                         " of the method: name=value is expected");
     }
     const std::string declaration = text.substr(0, equals);
     const std::size_t colon = std::min(declaration.find(':'), declaration.size());
     const std::string name = declaration.substr(0, colon);
     if (!isName(name)) {
-        throw UsageError("argument " + inQuotes(text) + ": not a name: " + inQuotes(name));
+        throw UsageError("argument " + std::to_string(number) +
+                         " of the method: not a name: " + inQuotes(name));
     }
     const bool typed = colon != declaration.size();
-    return {name, argumentValue(text, typed ? declaration.substr(colon + 1) : "string",
+    return {name, argumentValue(name, text, typed ? declaration.substr(colon + 1) : "string",
                                 text.substr(equals + 1))};
 }
 
@@ -127,10 +135,10 @@ client::PropertyList propertyListOf(bool given, const std::vector<std::string>& 
 client::Arguments methodArgumentsOf(const std::vector<std::string>& texts) {
     client::Arguments arguments;
     for (const std::string& text : texts) {
-        auto argument = argumentOf(text);
+        auto argument = argumentOf(text, arguments.size() + 1);
         for (const auto& [name, value] : arguments) {
             if (cim::sameName(name, argument.first)) {
-                throw UsageError("argument " + inQuotes(text) + ": the name is given twice");
+                throw UsageError(shown(name, text) + ": the name is given twice");
             }
         }
         arguments.push_back(std::move(argument));

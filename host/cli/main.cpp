@@ -14,7 +14,9 @@
 #include <cstring>
 #include <fcntl.h>
 #include <langinfo.h>
+#include <string>
 #include <unistd.h>
+#include <vector>
 
 namespace {
 
@@ -50,14 +52,18 @@ std::unique_ptr<qelo::client::Connection> connect(const qelo::cli::Options& opti
 int main(int argc, char** argv) {
     // Passwords and their hashes pass through this process.
     qelo::secrecy::keepMemoryPrivate();
-    argv = qelo::secrecy::hideSecrets(argc, argv);
+    const std::vector<std::string> texts = qelo::secrecy::hideSecrets(argc, argv);
+    std::vector<const char*> arguments;
+    for (const std::string& text : texts) {
+        arguments.push_back(text.c_str());
+    }
     occupyStandardDescriptors();
     // A reader that goes is noticed when writing fails.
     (void)std::signal(SIGPIPE, SIG_IGN);
     chooseLanguage();
     qelo::cli::FileOutput output(STDOUT_FILENO);
     qelo::cli::FileOutput errors(STDERR_FILENO);
-    return qelo::cli::runApplication(argc, argv,
+    return qelo::cli::runApplication(argc, arguments.data(),
                                      {connect,
                                       output,
                                       errors,

@@ -208,6 +208,18 @@ client::Arguments asGiven(const std::vector<UntypedArgument>& arguments) {
     return result;
 }
 
+// Does not repeat what was given: a password with a comma in it, written where a comma ends an
+// argument, arrives as the name of another one.
+[[noreturn]] void refuseArgument(const cim::MethodDeclaration& method) {
+    std::string text = "the method " + method.name + " has no such argument";
+    const char* separator = "; it has ";
+    for (const cim::ParameterDeclaration& parameter : method.parameters) {
+        text += separator + parameter.name;
+        separator = ", ";
+    }
+    refuse(text);
+}
+
 client::Arguments declaredArguments(const Typing& typing, const cim::MethodDeclaration& method,
                                     const std::vector<UntypedArgument>& arguments) {
     client::Arguments result;
@@ -215,7 +227,7 @@ client::Arguments declaredArguments(const Typing& typing, const cim::MethodDecla
     for (const UntypedArgument& argument : arguments) {
         const cim::ParameterDeclaration* parameter = findParameter(method, argument.name);
         if (parameter == nullptr) {
-            refuse("the method " + method.name + " has no argument \"" + argument.name + "\"");
+            refuseArgument(method);
         }
         cim::Value value = argumentValue(typing, argument, *parameter);
         if (!value.isNull()) {

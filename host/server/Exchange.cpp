@@ -1,10 +1,13 @@
 #include "Exchange.h"
 
+#include <secrecy/Forget.h>
+
 #include <cstdlib>
 #include <cstring>
 #include <malloc.h>
 #include <new>
 #include <poll.h>
+#include <strings.h>
 #include <utility>
 
 namespace qelo::server {
@@ -23,12 +26,12 @@ constexpr char kRealm[] = "Basic realm=\"qelosim\"";
 
 // A refused body up to this is read to its end, so that the client gets to see the answer
 // and may go on; for a larger one the connection is closed.
-constexpr std::size_t kReadInSpite = 64 * 1024;
+constexpr std::size_t kReadInSpite = 64UL * 1024;
 
 // Providers make an answer of this size out of memory that is worth giving back.
-constexpr std::size_t kLargeAnswer = 8 * 1024 * 1024;
+constexpr std::size_t kLargeAnswer = 8UL * 1024 * 1024;
 
-constexpr std::size_t kAnswerBlock = 32 * 1024;
+constexpr std::size_t kAnswerBlock = 32UL * 1024;
 // The time that a client has for each piece of an answer.
 constexpr auto kPieceTime = std::chrono::seconds(30);
 
@@ -46,7 +49,7 @@ using Secret = std::unique_ptr<char, FreeSecret>;
 // A copy that is wiped when it goes.
 class SecretText {
 public:
-    explicit SecretText(std::string text) : text_(std::move(text)) {}
+    explicit SecretText(const char* text) : text_(text) {}
     ~SecretText() { explicit_bzero(text_.data(), text_.size()); }
     SecretText(const SecretText&) = delete;
     SecretText& operator=(const SecretText&) = delete;
@@ -55,6 +58,17 @@ public:
 private:
     std::string text_;
 };
+
+// Whether a request gives values that are stored: those of methods and of instances. All others
+// are spared the wiping, since their answers may be large.
+bool mayHoldPassword(const cimxml::Request& request) {
+    const auto begins = [&request](const char* beginning) {
+        return strncasecmp(request.method.c_str(), beginning, std::strlen(beginning)) == 0;
+    };
+    const bool reads =
+        begins("Get") || begins("Enumerate") || begins("Associator") || begins("Reference");
+    return request.extrinsic || !reads;
+}
 
 void addHeader(MHD_Response* response, const char* name, const std::string& value) {
     MHD_add_response_header(response, name, value.c_str());
@@ -132,7 +146,7 @@ MHD_Result Exchange::begin(const std::string& method, const std::string& path) {
     }
     refusal_ = problem;
     if (server_.options.passwords) {
-        login();
+        secrecy::forget([this] { login(); });
     } else {
         phase_ = Phase::Body;
     }
@@ -156,8 +170,9 @@ void Exchange::login() {
     phase_ = Phase::Login;
     MHD_suspend_connection(connection_);
     const auto self = shared_from_this();
-    if (!server_.loginPool.submit(
-            [self, secret] { self->checkPassword(self->user_, secret->text()); })) {
+    if (!server_.loginPool.submit([self, secret] {
+            secrecy::forget([&] { self->checkPassword(self->user_, secret->text()); });
+        })) {
         refusal_ = {kUnavailable, "too many requests", ""};
         resume();
     }
@@ -229,7 +244,8 @@ MHD_Result Exchange::takeBody(const char* data, std::size_t size) {
     } else if (!server_.bodies.take(size)) {
         refusal_ = {kUnavailable, "too many requests", ""};
     } else {
-        body_.append(data, size);
+        // Each time it grows it leaves a smaller copy of itself.
+        secrecy::forget([&] { body_.append(data, size); });
         return MHD_YES;
     }
     phase_ = Phase::Refused;
@@ -305,10 +321,16 @@ void Exchange::runOperation() {
     stream_->fail();
 }
 
+secrecy::Forgotten<const cimxml::Request> Exchange::parsedBody() const {
+    secrecy::Forgotten<const cimxml::Request> request;
+    secrecy::forget([&] { request.reset(new cimxml::Request(cimxml::parseRequest(body_))); });
+    return request;
+}
+
 void Exchange::answer(const AnswerSink& sink) {
     try {
-        const cimxml::Request request = cimxml::parseRequest(body_);
-        refusal_ = checkHeaderMatch(request, headerLookup());
+        const auto request = parsedBody();
+        refusal_ = checkHeaderMatch(*request, headerLookup());
         if (refusal_) {
             return;
         }
@@ -317,7 +339,12 @@ void Exchange::answer(const AnswerSink& sink) {
         const auto header = headerLookup();
         context.acceptLanguage = header("Accept-Language").value_or("");
         context.contentLanguage = header("Content-Language").value_or("");
-        server_.operations->run(request, context, sink);
+        const auto run = [&] { server_.operations->run(*request, context, sink); };
+        if (mayHoldPassword(*request)) {
+            secrecy::forget(run);
+        } else {
+            run();
+        }
     } catch (const cimxml::RequestError& error) {
         refusal_ = {error.httpStatus(), error.what(), error.cimError()};
     }

@@ -8,7 +8,9 @@
 #include "ResponseStream.h"
 #include "ServerState.h"
 
+#include <cimxml/Request.h>
 #include <microhttpd.h>
+#include <secrecy/Forget.h>
 
 #include <memory>
 #include <string>
@@ -43,6 +45,7 @@ private:
     MHD_Result takeBody(const char* data, std::size_t size);
     void startOperation();
     void runOperation();
+    secrecy::Forgotten<const cimxml::Request> parsedBody() const;
     void answer(const AnswerSink& sink);
     MHD_Result sendAnswer();
     MHD_Result sendRefusal();

@@ -3,11 +3,14 @@
 #include "Exchange.h"
 #include "ServerState.h"
 
+#include <gnutls/gnutls.h>
 #include <microhttpd.h>
+#include <secrecy/Forget.h>
 
 #include <algorithm>
 #include <arpa/inet.h>
 #include <cstring>
+#include <malloc.h>
 #include <mutex>
 #include <netinet/in.h>
 #include <stdexcept>
@@ -20,9 +23,11 @@ namespace qelo::server {
 namespace {
 
 // Room for a connection's header and for the piece of an answer that is being sent.
-constexpr std::size_t kConnectionMemory = 64 * 1024;
+constexpr std::size_t kConnectionMemory = 64UL * 1024;
 constexpr unsigned int kConnectionThreads = 2;
 constexpr auto kWatchPeriod = std::chrono::seconds(1);
+// Connections end, and free what they had, a while after their last request.
+constexpr unsigned int kTrims = 5;
 constexpr auto kGrace = std::chrono::seconds(5);
 
 struct SocketAddress {
@@ -65,6 +70,7 @@ void raiseDescriptorLimit(unsigned int connections) {
 void ExchangeList::add(const std::shared_ptr<Exchange>& exchange) {
     const std::lock_guard<std::mutex> lock(mutex_);
     exchanges_.insert(exchange);
+    ++added_;
 }
 
 void ExchangeList::remove(const std::shared_ptr<Exchange>& exchange) {
@@ -75,6 +81,11 @@ void ExchangeList::remove(const std::shared_ptr<Exchange>& exchange) {
 std::set<std::shared_ptr<Exchange>> ExchangeList::all() const {
     const std::lock_guard<std::mutex> lock(mutex_);
     return exchanges_;
+}
+
+std::optional<std::size_t> ExchangeList::countWhenIdle() const {
+    const std::lock_guard<std::mutex> lock(mutex_);
+    return exchanges_.empty() ? std::optional(added_) : std::nullopt;
 }
 
 bool isLoopback(const std::string& address) {
@@ -167,6 +178,8 @@ MHD_Daemon* HttpServer::Impl::start() {
         {MHD_OPTION_NOTIFY_CONNECTION, reinterpret_cast<std::intptr_t>(&connected), this},
     };
     if (!options.certificate.empty()) {
+        // Requests stay in what has been decrypted, which is freed as it is otherwise.
+        gnutls_free = secrecy::releaseWiped;
         flags |= MHD_USE_TLS;
         items.push_back(
             {MHD_OPTION_HTTPS_MEM_CERT, 0, const_cast<char*>(options.certificate.c_str())});
@@ -241,9 +254,21 @@ void HttpServer::Impl::connected(void* self, MHD_Connection* connection, void**,
 }
 
 void HttpServer::Impl::watch() {
+    std::size_t served = 0;
+    unsigned int trims = 0; // still to come
     std::unique_lock<std::mutex> lock(watchMutex_);
     while (!watchEnds_.wait_for(lock, kWatchPeriod, [this] { return !watching_; })) {
         state_.watch.endLate();
+        // Requests that were at work together leave holes behind, which add up over days.
+        const auto count = state_.exchanges.countWhenIdle();
+        if (count && *count != served) {
+            served = *count;
+            trims = kTrims;
+        }
+        if (count && trims > 0) {
+            --trims;
+            malloc_trim(0);
+        }
     }
 }
 

@@ -16,17 +16,17 @@
 namespace qelo::server {
 
 struct ServerLimits {
-    std::size_t header = 16 * 1024;              // bytes of a request's header: 431 beyond
-    std::size_t body = 4 * 1024 * 1024;          // bytes of a request's body: 413 beyond
-    std::size_t bodies = 64 * 1024 * 1024;       // bytes of all bodies at a time: 503 beyond
+    std::size_t header = 16UL * 1024;            // bytes of a request's header: 431 beyond
+    std::size_t body = 4UL * 1024 * 1024;        // bytes of a request's body: 413 beyond
+    std::size_t bodies = 64UL * 1024 * 1024;     // bytes of all bodies at a time: 503 beyond
     unsigned int connections = 1024;             // at a time; further ones wait
     std::chrono::seconds idle{10};               // without a byte in either direction
     std::chrono::seconds request{30};            // from the first byte of a request to its last
-    std::size_t answerRate = 8 * 1024;           // bytes a second that a client must take
+    std::size_t answerRate = 8UL * 1024;         // bytes a second that a client must take
     std::size_t workers = 16;                    // operations at a time
     std::size_t logins = 4;                      // passwords checked at a time
     std::size_t backlog = 1024;                  // requests that wait for a worker: 503 beyond
-    std::size_t spill = 1024 * 1024 * 1024;      // bytes of answers waiting in files
+    std::size_t spill = 1024UL * 1024 * 1024;    // bytes of answers waiting in files
     std::chrono::milliseconds failedLogin{1000}; // how long an answer to one is held back
     std::chrono::seconds rememberLogin{30};      // see LoginCache
 };

@@ -29,7 +29,7 @@ public:
     bool restart();
 
 private:
-    static constexpr std::size_t kPiece = 32 * 1024;
+    static constexpr std::size_t kPiece = 32UL * 1024;
 
     const AnswerSink& sink_;
     const cimxml::ResponseWriter& writer_;

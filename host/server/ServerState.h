@@ -11,6 +11,7 @@
 #include <atomic>
 #include <cstddef>
 #include <memory>
+#include <optional>
 #include <set>
 #include <string>
 
@@ -24,10 +25,13 @@ public:
     void add(const std::shared_ptr<Exchange>& exchange);
     void remove(const std::shared_ptr<Exchange>& exchange);
     std::set<std::shared_ptr<Exchange>> all() const;
+    // How many there were so far, when there is none now; nothing otherwise.
+    std::optional<std::size_t> countWhenIdle() const;
 
 private:
     mutable std::mutex mutex_;
     std::set<std::shared_ptr<Exchange>> exchanges_;
+    std::size_t added_ = 0;
 };
 
 struct ServerState {

@@ -17,7 +17,6 @@
 #include <stdexcept>
 #include <string>
 #include <sys/eventfd.h>
-#include <sys/resource.h>
 #include <sys/stat.h>
 #include <system_error>
 #include <unistd.h>
@@ -174,9 +173,6 @@ void serve(CommandContext& context, const ServeOptions& options) {
     // Memory of a large answer is to go back to the system; with an arena for each worker much
     // of it would stay.
     mallopt(M_ARENA_MAX, 2);
-    // Passwords pass through this process; they are not to end up in a core image.
-    const rlimit none = {0, 0};
-    setrlimit(RLIMIT_CORE, &none);
     const ListenAddress address = listenAddressOf(options);
     server::ServerOptions serverOptions = serverOptionsOf(options, address);
     const LocalObjectManager manager = openLocalObjectManager(context.options());

@@ -143,9 +143,9 @@ TEST_F(DeclaredTest, An_argument_without_a_value_is_not_given) {
     EXPECT_EQ(call.arguments[0].second, Value::string(""));
 }
 
-TEST_F(DeclaredTest, An_argument_that_the_method_has_not_is_refused) {
+TEST_F(DeclaredTest, An_argument_that_the_method_has_not_is_refused_without_repeating_it) {
     EXPECT_EQ(argumentRefusal({"Unknown", Value::string("7"), false}),
-              "the method Do has no argument \"Unknown\"");
+              "the method Do has no such argument; it has Count, Text, When, Other");
 }
 
 TEST_F(DeclaredTest, A_method_that_the_class_has_not_is_not_found) {

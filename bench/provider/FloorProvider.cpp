@@ -126,6 +126,7 @@ CMPIInstance* make(const CMPIObjectPath* ref, const ReadyInstance& source) {
     CMSetHostname(path, host.c_str());
     CMPIInstance* instance = CMNewInstance(broker, path, nullptr);
     std::vector<const char*> keys;
+    keys.reserve(keyNames.size() + 1);
     for (const std::string& name : keyNames) {
         keys.push_back(name.c_str());
     }

@@ -54,6 +54,7 @@ int main(int argc, char** argv) {
     qelo::secrecy::keepMemoryPrivate();
     const std::vector<std::string> texts = qelo::secrecy::hideSecrets(argc, argv);
     std::vector<const char*> arguments;
+    arguments.reserve(texts.size());
     for (const std::string& text : texts) {
         arguments.push_back(text.c_str());
     }

@@ -59,7 +59,8 @@ HeldLines& HeldLines::instance() {
 HeldLines::HeldLines() {
     ::sem_init(&wake_, 0, 0);
     ::pthread_atfork(&beforeFork, &afterForkInParent, &afterForkInChild);
-    std::atexit(&atExit);
+    // Refused, the lines of the last moment are lost.
+    (void)std::atexit(&atExit);
 }
 
 void HeldLines::add(LineHolder& holder) {

@@ -5,7 +5,6 @@ namespace qelo::test {
 namespace {
 
 using testing::ElementsAre;
-using testing::IsEmpty;
 
 constexpr const char* operation = "GetInstance";
 

@@ -18,6 +18,7 @@ using namespace qelo::server;
 using testing::ElementsAre;
 using testing::HasSubstr;
 using testing::Not;
+using testing::Optional;
 
 class OperationsTest : public testing::Test {
 protected:
@@ -195,6 +196,32 @@ TEST_F(OperationsTest, Changes_go_to_the_provider) {
                                               "GetProperty root/test:TEST_Thing.Id=\"1\" Size"));
 }
 
+TEST_F(OperationsTest, A_new_value_may_be_a_list_a_reference_or_nothing) {
+    const std::string property =
+        instanceNameParameter("InstanceName", "1") + textParameter("PropertyName", "Text");
+    intrinsic("SetProperty", property + "<IPARAMVALUE NAME=\"NewValue\"><VALUE.ARRAY><VALUE>a"
+                                        "</VALUE><VALUE.NULL/></VALUE.ARRAY></IPARAMVALUE>");
+    intrinsic("SetProperty", property + "<IPARAMVALUE NAME=\"NewValue\"><VALUE.REFERENCE>" +
+                                 instanceNameElement("2") + "</VALUE.REFERENCE></IPARAMVALUE>");
+    intrinsic("SetProperty", property);
+    const std::string asked = "SetProperty root/test:TEST_Thing.Id=\"1\" Text=";
+    const auto list = cim::Value::array(cim::Type::String, {cim::Value::string("a"), cim::Value()});
+    EXPECT_THAT(router_->asked(),
+                ElementsAre(asked + list.toText(), HasSubstr("TEST_Thing.Id=\"2\""),
+                            asked + cim::Value().toText()));
+}
+
+TEST_F(OperationsTest, Without_subclasses_only_properties_of_the_class_itself_are_asked_for) {
+    const std::string base =
+        classNameParameter("TEST_Base") + textParameter("DeepInheritance", "false");
+    intrinsic("EnumerateInstances", base);
+    EXPECT_THAT(router_->lastProperties, Optional(ElementsAre("Id")));
+    intrinsic("EnumerateInstances",
+              base + "<IPARAMVALUE NAME=\"PropertyList\"><VALUE.ARRAY><VALUE>Text</VALUE>"
+                     "<VALUE>ID</VALUE></VALUE.ARRAY></IPARAMVALUE>");
+    EXPECT_THAT(router_->lastProperties, Optional(ElementsAre("ID")));
+}
+
 TEST_F(OperationsTest, A_query_goes_to_the_provider_of_the_class_behind_from) {
     intrinsic("ExecQuery", textParameter("QueryLanguage", "WQL") +
                                textParameter("Query", "select * from\n TEST_Thing where Id=1"));
@@ -271,6 +298,19 @@ cim::ObjectPath linkTo(const std::string& host) {
     cim::ObjectPath link("root/test", "TEST_Link");
     link.setKey("Near", cim::Value::reference(target));
     return link;
+}
+
+TEST(LocalReferences, Lose_it_in_lists_too) {
+    const cim::Value list = cim::Value::array(
+        cim::Type::Reference, {*linkTo("host.test").key("Near"), *linkTo("elsewhere").key("Near")});
+    cim::Instance holder(FakeRouter::path(1));
+    holder.setProperty("All", list);
+    const auto local = withLocalReferences(holder, "host.test");
+    ASSERT_TRUE(local);
+    const cim::Value::Array& found = local->property("All")->asArray();
+    ASSERT_EQ(found.size(), 2U);
+    EXPECT_EQ(found[0].asReference().host(), "");
+    EXPECT_EQ(found[1].asReference().host(), "elsewhere");
 }
 
 TEST(LocalReferences, Lose_the_name_of_this_host_only) {

@@ -100,16 +100,16 @@ template <Care threshold> bool isPlain(std::string_view text) {
 // The digits of a number, as long as this lives.
 class Digits {
 public:
-    template <class Integer>
-    explicit Digits(Integer number)
-        : end_(std::to_chars(digits_.data(), digits_.data() + digits_.size(), number).ptr) {}
+    template <class Integer> explicit Digits(Integer number) {
+        end_ = std::to_chars(digits_.data(), digits_.data() + digits_.size(), number).ptr;
+    }
     std::string_view text() const {
         return {digits_.data(), static_cast<std::size_t>(end_ - digits_.data())};
     }
 
 private:
-    std::array<char, 24> digits_; // 64 bits take at most 20 characters
-    const char* end_;
+    std::array<char, 24> digits_{}; // 64 bits take at most 20 characters
+    const char* end_ = nullptr;
 };
 
 } // namespace

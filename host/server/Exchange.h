@@ -65,8 +65,7 @@ private:
     MHD_Connection* const connection_;
     Phase phase_ = Phase::Header;
     HttpRefusal refusal_;
-    bool wantsPassword_ = false; // of a refusal: the client may try again with another one
-    bool bodyIsSmall_ = false;   // worth reading to its end before it is refused
+    bool bodyIsSmall_ = false; // worth reading to its end before it is refused
     std::string user_;
     std::string body_;
     std::size_t discarded_ = 0;

@@ -6,7 +6,6 @@
 namespace qelo::test {
 namespace {
 
-using testing::IsEmpty;
 
 class AssociationTrace : public AssociationFixture {
 protected:

@@ -6,7 +6,6 @@ namespace {
 
 using testing::Contains;
 using testing::ElementsAre;
-using testing::IsEmpty;
 
 constexpr const char* operation = "Associators";
 

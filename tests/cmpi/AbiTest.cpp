@@ -36,9 +36,10 @@ const std::vector<AbiFact>& factsOfCpp() {
 template <typename Facts> std::vector<std::string> mismatches(const Facts& begin, std::size_t n) {
     std::vector<std::string> result;
     for (std::size_t i = 0; i < n; ++i) {
-        if (begin[i].expected != begin[i].actual)
+        if (begin[i].expected != begin[i].actual) {
             result.push_back(std::string(begin[i].what) + ": " + std::to_string(begin[i].actual) +
                              " instead of " + std::to_string(begin[i].expected));
+        }
     }
     return result;
 }

@@ -6,7 +6,6 @@
 namespace qelo::test {
 namespace {
 
-
 class AssociationTrace : public AssociationFixture {
 protected:
     const std::vector<std::function<Outcome()>> operations_ = {

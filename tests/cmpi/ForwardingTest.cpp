@@ -19,15 +19,16 @@ namespace {
 using Words = std::vector<std::uint64_t>;
 
 template <typename T> void append(Words& words, T value) {
-    if constexpr (std::is_pointer_v<T>)
+    if constexpr (std::is_pointer_v<T>) {
         words.push_back(reinterpret_cast<std::uintptr_t>(value));
-    else if constexpr (std::is_same_v<T, CMPIStatus>)
+    } else if constexpr (std::is_same_v<T, CMPIStatus>) {
         words.insert(words.end(),
                      {std::uint64_t{value.rc}, reinterpret_cast<std::uintptr_t>(value.msg)});
-    else if constexpr (std::is_same_v<T, CMPIData>)
+    } else if constexpr (std::is_same_v<T, CMPIData>) {
         words.insert(words.end(), {value.type, value.state, value.value.uint64});
-    else
+    } else {
         words.push_back(static_cast<std::uint64_t>(value));
+    }
 }
 
 // A value that no other call of sample() returns, within the range of T.
@@ -180,10 +181,11 @@ struct Passed {
 CMPIStatus takeValue(const CMPIInstance*, const char*, const CMPIValue* value, CMPIType type) {
     passed = Passed();
     passed.type = type;
-    if (type == CMPI_chars)
+    if (type == CMPI_chars) {
         passed.text = reinterpret_cast<const char*>(value);
-    else
+    } else {
         std::memcpy(&passed.number, static_cast<const void*>(value), sizeof passed.number);
+    }
     return {CMPI_RC_OK, nullptr};
 }
 

@@ -30,12 +30,14 @@ protected:
 
     // What is offered for the last of these words, as bash splits them.
     Words offered(std::vector<std::string> words, const Variables& more = {}) const {
+        // NOLINTBEGIN(bugprone-suspicious-missing-comma): the program is one argument
         words.insert(words.begin(),
                      {"bash", "--norc", "--noprofile", "-c",
                       "set -u; source \"$1\"; shift; COMP_WORDS=(\"$@\"); COMP_CWORD=$(($# - 1)); "
                       "COMP_WORDBREAKS=$' \\t\\n\"\\'><=;|&(:'; _qelosim; "
                       "[[ ${#COMPREPLY[@]} == 0 ]] || printf '%s\\n' \"${COMPREPLY[@]}\"",
                       "bash", QELOSIM_COMPLETION, "qelosim"});
+        // NOLINTEND(bugprone-suspicious-missing-comma)
         Variables variables = {{"QELO_NODE_STORE", ""}};
         variables.insert(variables.end(), more.begin(), more.end());
         const Finished finished = runProcess(words, variables);

@@ -69,7 +69,7 @@ struct Streams {
         arguments.push_back(const_cast<char*>(argument.c_str()));
     }
     arguments.push_back(nullptr);
-    std::signal(SIGPIPE, SIG_DFL);
+    (void)std::signal(SIGPIPE, SIG_DFL);
     dup2(streams.in, STDIN_FILENO);
     dup2(streams.err, STDERR_FILENO);
     if (streams.out >= 0) {

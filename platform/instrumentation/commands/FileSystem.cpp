@@ -97,6 +97,11 @@ bool PosixFileSystem::list(int directory, std::vector<std::string>& names) {
     const std::unique_ptr<DIR, int (*)(DIR*)> stream(own < 0 ? nullptr : ::fdopendir(own),
                                                      &::closedir);
     if (!stream) {
+        const int failure = errno;
+        if (own >= 0) {
+            ::close(own);
+        }
+        errno = failure;
         return false;
     }
     errno = 0;

@@ -2,7 +2,10 @@
 
 #include <curl/curl.h>
 
+#include <algorithm>
+#include <cctype>
 #include <memory>
+#include <string_view>
 
 namespace qelo::client {
 namespace {
@@ -26,6 +29,18 @@ std::optional<std::string> part(const Url& url, CURLUPart which, unsigned int fl
     return std::string(text);
 }
 
+// Of host names and of zones. Whatever is beyond ASCII is left to the resolver.
+bool isNameCharacter(char c) {
+    return std::isalnum(static_cast<unsigned char>(c)) != 0 || c == '-' || c == '.' || c == '_' ||
+           (static_cast<unsigned char>(c) & 0x80U) != 0;
+}
+
+// Escapes are gone by now, and may have stood for anything.
+bool isHost(std::string_view host) {
+    const bool number = !host.empty() && host.front() == '['; // checked by libcurl
+    return number || std::all_of(host.begin(), host.end(), isNameCharacter);
+}
+
 std::string problemOf(const Url& url) {
     const std::string scheme = part(url, CURLUPART_SCHEME).value_or("");
     if (scheme != "http" && scheme != "https") {
@@ -38,11 +53,21 @@ std::string problemOf(const Url& url) {
     if (part(url, CURLUPART_PORT).value_or("1") == "0") {
         return "port 0 is nobody's";
     }
-    // Left over from an escape of an escape, which would be taken for one the next time.
-    if (part(url, CURLUPART_HOST).value_or("").find('%') != std::string::npos) {
+    const std::string zone = part(url, CURLUPART_ZONEID).value_or("");
+    if (!isHost(part(url, CURLUPART_HOST).value_or("")) ||
+        !std::all_of(zone.begin(), zone.end(), isNameCharacter)) {
         return "no host is called that";
     }
     return {};
+}
+
+// The host as it is written in a URL, with the zone of a link-local address (RFC 6874).
+std::string hostOf(const Url& url) {
+    std::string host = part(url, CURLUPART_HOST).value_or("");
+    if (const auto zone = part(url, CURLUPART_ZONEID); zone && !host.empty()) {
+        host.insert(host.size() - 1, "%25" + *zone);
+    }
+    return host;
 }
 
 } // namespace
@@ -72,7 +97,7 @@ std::optional<ServerAddress> parseServerUrl(const std::string& text, std::string
     }
     ServerAddress address;
     address.tls = part(url, CURLUPART_SCHEME) == "https";
-    address.host = part(url, CURLUPART_HOST).value_or("");
+    address.host = hostOf(url);
     const auto port = part(url, CURLUPART_PORT);
     address.port = port ? static_cast<std::uint16_t>(std::stoul(*port))
                         : (address.tls ? kTlsPort : kPlainPort);

@@ -17,6 +17,10 @@ cim::ObjectPath toCim(const ObjectPathObject& path, int depth = 0);
 // With the listed properties only, when there is a list.
 cim::Instance toCim(const InstanceObject& instance, const client::PropertyList& properties = {},
                     int depth = 0);
+
+// The same into an instance that was filled before: what both have is not made anew.
+void assign(cim::Instance& to, const InstanceObject& instance,
+            const client::PropertyList& properties, int depth = 0);
 client::Arguments toCim(const ArgsObject& args);
 OperationContext toCim(const ContextObject& context);
 

@@ -108,7 +108,28 @@ cim::Value arrayValue(const ArrayObject& array, int depth) {
     return cim::Value::array(cimType(array.elementType), std::move(elements));
 }
 
-bool isWanted(const client::PropertyList& properties, const std::string& name) {
+// Into a value that may have been filled before. Most of them are texts.
+void assign(cim::Value& to, const CMPIData& data, int depth) {
+    if (data.type == CMPI_string && (data.state & CMPI_nullValue) == 0) {
+        to.setString(alive<StringObject>(data.value.string).view());
+    } else {
+        to = toCim(data, depth);
+    }
+}
+
+void assign(cim::ObjectPath& to, const ObjectPathObject& path, int depth) {
+    checkDepth(depth);
+    to.assignNames(path.host->view(), path.nameSpace->view(), path.className->view());
+    std::vector<cim::ObjectPath::Key>& keys = to.mutableKeys();
+    keys.resize(path.keys.size());
+    for (std::size_t i = 0; i < keys.size(); ++i) {
+        const Entry& key = path.keys[i];
+        keys[i].name.assign(key.name->view());
+        assign(keys[i].value, key.data, depth);
+    }
+}
+
+bool isWanted(const client::PropertyList& properties, std::string_view name) {
     return !properties ||
            std::any_of(properties->begin(), properties->end(),
                        [&](const std::string& wanted) { return cim::sameName(wanted, name); });
@@ -135,30 +156,38 @@ cim::Value toCim(const CMPIData& data, int depth) {
 }
 
 cim::ObjectPath toCim(const ObjectPathObject& path, int depth) {
-    checkDepth(depth);
-    cim::ObjectPath out(textOf(*path.nameSpace), textOf(*path.className));
-    out.setHost(textOf(*path.host));
-    out.reserveKeys(path.keys.size());
-    for (const Entry& key : path.keys) {
-        out.setKey(key.name->view(), toCim(key.data, depth));
-    }
+    cim::ObjectPath out;
+    assign(out, path, depth);
     return out;
 }
 
 cim::Instance toCim(const InstanceObject& instance, const client::PropertyList& properties,
                     int depth) {
+    cim::Instance out;
+    assign(out, instance, properties, depth);
+    return out;
+}
+
+void assign(cim::Instance& to, const InstanceObject& instance,
+            const client::PropertyList& properties, int depth) {
     checkDepth(depth);
-    cim::Instance out(toCim(*instance.path, depth));
+    assign(to.mutablePath(), *instance.path, depth);
+    std::vector<cim::Instance::Property>& out = to.mutableProperties();
     out.reserve(instance.properties.size());
+    std::size_t count = 0;
     for (const Entry& entry : instance.properties) {
-        std::string name = textOf(*entry.name);
-        if (!isWanted(properties, name)) {
+        if (!isWanted(properties, entry.name->view())) {
             continue;
         }
-        std::string origin = entry.origin ? textOf(*entry.origin) : std::string();
-        out.append({std::move(name), toCim(entry.data, depth), std::move(origin)});
+        if (count == out.size()) {
+            out.emplace_back();
+        }
+        cim::Instance::Property& property = out[count++];
+        property.name.assign(entry.name->view());
+        property.origin.assign(entry.origin ? entry.origin->view() : std::string_view());
+        assign(property.value, entry.data, depth);
     }
-    return out;
+    out.resize(count);
 }
 
 client::Arguments toCim(const ArgsObject& args) {

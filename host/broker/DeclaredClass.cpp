@@ -20,7 +20,7 @@ std::size_t tableSize(std::size_t properties) {
 } // namespace
 
 DeclaredClass::DeclaredClass(const cim::Class& declared)
-    : table_(tableSize(declared.properties.size())) {
+    : table_(tableSize(declared.properties.size())), followers_(table_.size() + 1) {
     for (const cim::PropertyDeclaration& property : declared.properties) {
         DeclaredProperty entry;
         entry.name = property.name;

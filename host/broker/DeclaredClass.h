@@ -6,6 +6,8 @@
 
 #include <cmpi/cmpidt.h>
 
+#include <atomic>
+#include <cstddef>
 #include <cstdint>
 #include <string_view>
 #include <vector>
@@ -26,7 +28,8 @@ struct DeclaredProperty {
     }
 };
 
-// Immutable. The class must outlive it.
+// Immutable but for what it learns of the order in which providers set properties. Safe to use from
+// several threads. The class must outlive it.
 class DeclaredClass {
 public:
     explicit DeclaredClass(const cim::Class& declared);
@@ -34,10 +37,24 @@ public:
     // The property of that name (`hash` is its nameHash()), or null.
     const DeclaredProperty* find(std::string_view name, std::uint32_t hash) const;
 
+    // The one that was set after `last` (null: as the first one) in another instance, or null.
+    // Providers set the properties of all their instances in the same order.
+    const DeclaredProperty* likelyAfter(const DeclaredProperty* last) const {
+        return followers_[placeOf(last)].load(std::memory_order_relaxed);
+    }
+    void noteFollower(const DeclaredProperty* last, const DeclaredProperty& next) const {
+        followers_[placeOf(last)].store(&next, std::memory_order_relaxed);
+    }
+
 private:
     void insert(const DeclaredProperty& property);
+    std::size_t placeOf(const DeclaredProperty* property) const {
+        return property ? static_cast<std::size_t>(property - table_.data()) : table_.size();
+    }
 
     std::vector<DeclaredProperty> table_; // open addressing; the size is a power of two
+    // Of each place of the table, and of the beginning.
+    mutable std::vector<std::atomic<const DeclaredProperty*>> followers_;
 };
 
 } // namespace qelo::broker

@@ -8,6 +8,7 @@ namespace qelo::broker {
 namespace {
 
 void learnKeys(InstanceObject& instance) {
+    instance.lastSet = nullptr; // of another class, perhaps
     if (!instance.broker) {
         return;
     }
@@ -36,6 +37,22 @@ bool canBeKey(const CMPIData& data) {
 const DeclaredProperty* declaredProperty(const InstanceObject& instance, std::string_view name,
                                          std::uint32_t hash) {
     return instance.declared ? instance.declared->find(name, hash) : nullptr;
+}
+
+// The one that the name is likely to mean, if it does, in the spelling of the declaration.
+const DeclaredProperty* expectedProperty(const InstanceObject& instance, std::string_view name) {
+    if (!instance.declared) {
+        return nullptr;
+    }
+    const DeclaredProperty* expected = instance.declared->likelyAfter(instance.lastSet);
+    return expected && expected->name == name ? expected : nullptr;
+}
+
+void noteSet(InstanceObject& instance, const DeclaredProperty* declared) {
+    if (declared && instance.declared->likelyAfter(instance.lastSet) != declared) {
+        instance.declared->noteFollower(instance.lastSet, *declared);
+    }
+    instance.lastSet = declared;
 }
 
 // Refuses what contradicts the class. A null of no type gets the declared one.
@@ -124,14 +141,18 @@ InstanceObject* newInstance(Arena& arena, const ObjectPathObject& path, Ownershi
 
 void setProperty(InstanceObject& instance, std::string_view name, CMPIData data,
                  StringObject* origin) {
-    const std::uint32_t hash = nameHash(name);
-    const DeclaredProperty* declared = declaredProperty(instance, name, hash);
+    const DeclaredProperty* declared = expectedProperty(instance, name);
+    const std::uint32_t hash = declared ? declared->hash : nameHash(name);
+    if (!declared && instance.declared) {
+        declared = instance.declared->find(name, hash);
+    }
     checkDeclared(instance, declared, data);
     noteKey(instance, name, hash, data, declared);
     if (instance.filtered && !instance.filter.has(name, hash)) {
         return;
     }
     instance.properties.set(*instance.arena, name, hash, data, origin);
+    noteSet(instance, declared);
     instance.arena->notePropertyCount(instance.properties.size());
 }
 

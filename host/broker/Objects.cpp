@@ -40,6 +40,9 @@ void copyNames(NameSet& to, const NameSet& from, Arena& arena) {
 } // namespace
 
 Entry* EntryList::find(std::string_view name, std::uint32_t hash) {
+    if ((hashes_ & bitOf(hash)) == 0) {
+        return nullptr;
+    }
     for (Entry& entry : entries_) {
         if (entry.hash == hash && cim::sameName(entry.name->view(), name)) {
             return &entry;
@@ -59,7 +62,7 @@ void EntryList::set(Arena& arena, std::string_view name, std::uint32_t hash, con
         entry->origin = origin;
         return;
     }
-    entries_.append(arena, Entry{arena.name(name, hash), hash, data, origin});
+    append(arena, Entry{arena.name(name, hash), hash, data, origin});
 }
 
 void NameSet::add(Arena& arena, std::string_view name) {

@@ -16,6 +16,7 @@ namespace qelo::broker {
 
 class Broker;
 class DeclaredClass;
+struct DeclaredProperty;
 
 enum class Ownership : std::uint8_t {
     Call,      // made by a factory or an up-call: ends with the call, or early when released
@@ -99,12 +100,22 @@ public:
     }
     void set(Arena& arena, std::string_view name, std::uint32_t hash, const CMPIData& data,
              StringObject* origin);
-    void append(Arena& arena, const Entry& entry) { entries_.append(arena, entry); }
+    // Whoever appends knows that there is none of that name.
+    void append(Arena& arena, const Entry& entry) {
+        entries_.append(arena, entry);
+        hashes_ |= bitOf(entry.hash);
+    }
     void reserve(Arena& arena, std::size_t count) { entries_.reserve(arena, count); }
-    void clear() { entries_.clear(); }
+    void clear() {
+        entries_.clear();
+        hashes_ = 0;
+    }
 
 private:
+    static std::uint64_t bitOf(std::uint32_t hash) { return std::uint64_t{1} << (hash % 64); }
+
     ArenaVector<Entry> entries_;
+    std::uint64_t hashes_ = 0; // a bit for each hash that is there: most others need no search
 };
 
 struct ObjectPathObject : Object<CMPIObjectPath, CMPIObjectPathFT> {
@@ -147,6 +158,7 @@ struct InstanceObject : Object<CMPIInstance, CMPIInstanceFT> {
     NameSet keyNames;       // properties that are keys, from the schema or the provider
     bool keysKnown = false; // the schema names the keys of the class
     const DeclaredClass* declared = nullptr; // null: the schema does not know the class
+    const DeclaredProperty* lastSet = nullptr;
     const Broker* broker = nullptr;
     static const Table table;
     static constexpr const char* typeName = "CMPIInstance";

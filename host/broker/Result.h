@@ -25,6 +25,7 @@ struct ResultObject : Object<CMPIResult, CMPIResultFT> {
     client::PathSink pathSink;
     client::PropertyList properties;       // instances reach the sink with these only
     std::string nameSpace;                 // for results that name none
+    cim::Instance converted;               // the last instance, filled again for the next
     std::optional<cim::Value> value;       // Kind::Value
     bool done = false;                     // returnDone was called
     std::exception_ptr sinkFailure;        // thrown by a sink; the request is given up

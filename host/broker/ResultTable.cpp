@@ -42,7 +42,8 @@ void keepValue(ResultObject& result, cim::Value value) {
 }
 
 void putInstance(ResultObject& result, const InstanceObject& instance) {
-    cim::Instance converted = toCim(instance, result.properties);
+    cim::Instance& converted = result.converted;
+    assign(converted, instance, result.properties);
     if (converted.path().nameSpace().empty()) {
         converted.mutablePath().setNameSpace(result.nameSpace);
     }

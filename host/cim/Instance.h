@@ -38,6 +38,9 @@ public:
     void reserve(std::size_t count) { properties_.reserve(count); }
     void append(Property property) { properties_.push_back(std::move(property)); }
 
+    // For whoever fills the same instance again and again. No two names may be the same.
+    std::vector<Property>& mutableProperties() { return properties_; }
+
 private:
     ObjectPath path_;
     std::vector<Property> properties_;

@@ -38,6 +38,16 @@ public:
     void clearKeys() { keys_.clear(); }
     void reserveKeys(std::size_t count) { keys_.reserve(count); }
 
+    // For whoever fills the same path again and again; what it had keeps its memory. No two names
+    // of keys may be the same.
+    void assignNames(std::string_view host, std::string_view nameSpace,
+                     std::string_view className) {
+        host_.assign(host);
+        nameSpace_.assign(nameSpace);
+        className_.assign(className);
+    }
+    std::vector<Key>& mutableKeys() { return keys_; }
+
     // The key of that name, or null.
     const Value* key(std::string_view name) const;
 

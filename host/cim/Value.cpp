@@ -139,6 +139,16 @@ Value Value::real(Type type, double value) {
 
 Value Value::string(std::string text) { return Value(Type::String, false, std::move(text)); }
 
+void Value::setString(std::string_view text) {
+    if (auto* const held = std::get_if<std::string>(&data_)) {
+        held->assign(text);
+    } else {
+        data_ = std::string(text);
+    }
+    type_ = Type::String;
+    array_ = false;
+}
+
 Value Value::dateTime(cim::DateTime value) {
     return Value(Type::DateTime, false, std::move(value));
 }

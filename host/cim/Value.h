@@ -9,6 +9,7 @@
 #include <cstdint>
 #include <memory>
 #include <string>
+#include <string_view>
 #include <utility>
 #include <variant>
 #include <vector>
@@ -64,6 +65,10 @@ public:
     static Value reference(ObjectPath path);
     static Value instance(Instance value);
     static Value array(Type type, Array elements); // scalars of that type, or nulls of it
+
+    // Becomes a string. One that was a string keeps its memory: for whoever fills the same values
+    // again and again.
+    void setString(std::string_view text);
 
     Type type() const { return type_; }
     bool isArray() const { return array_; }

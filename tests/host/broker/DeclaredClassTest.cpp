@@ -3,6 +3,10 @@
 
 #include <gmock/gmock.h>
 
+#include <algorithm>
+#include <cctype>
+#include <set>
+
 namespace qelo::broker::testing {
 namespace {
 
@@ -120,6 +124,44 @@ TEST_F(DeclaredClassTest, An_unknown_class_takes_everything) {
     CMPIValue value = {};
     EXPECT_EQ(set(inst, "Color", "red", CMPI_chars), CMPI_RC_OK);
     EXPECT_EQ(set(inst, "Size", &value, CMPI_uint64), CMPI_RC_OK);
+}
+
+// The broker expects each instance to be filled like those before.
+TEST_F(DeclaredClassTest, Properties_may_come_in_another_order_each_time) {
+    const std::vector<std::vector<const char*>> orders = {
+        {"Name", "Part", "Name"}, {"Name", "Part"}, {"Part", "Name"}, {"NAME", "part", "Name"},
+        {"Part", "Part", "Part"}, {"Name", "Name"}, {"Name", "Part"}};
+    for (const auto& names : orders) {
+        CMPIInstance* inst = instance();
+        for (const char* name : names) {
+            EXPECT_EQ(set(inst, name, "early", CMPI_chars), CMPI_RC_OK);
+            EXPECT_EQ(set(inst, "Color", "red", CMPI_chars), CMPI_RC_ERR_NO_SUCH_PROPERTY);
+            EXPECT_EQ(set(inst, name, name, CMPI_chars), CMPI_RC_OK);
+        }
+        std::set<std::string> lower;
+        for (const char* name : names) {
+            EXPECT_TRUE(has(inst, name)) << name;
+            std::string folded = name;
+            std::transform(folded.begin(), folded.end(), folded.begin(), ::tolower);
+            lower.insert(folded);
+        }
+        EXPECT_EQ(inst->ft->getPropertyCount(inst, nullptr), lower.size());
+        EXPECT_EQ(has(inst, "Name"), lower.count("name") == 1);
+        CMPIString* first = nullptr;
+        inst->ft->getPropertyAt(inst, 0, &first, nullptr);
+        EXPECT_EQ(text(first), names.front()) << "in the spelling that came first";
+    }
+}
+
+TEST_F(DeclaredClassTest, An_instance_that_moves_to_another_class_keeps_to_that_one) {
+    CMPIInstance* inst = instance("TEST_Other");
+    EXPECT_EQ(set(inst, "Color", "red", CMPI_chars), CMPI_RC_OK);
+    inst->ft->setObjectPath(inst, path("TEST_Thing"));
+    EXPECT_EQ(set(inst, "Name", "one", CMPI_chars), CMPI_RC_OK);
+    inst->ft->setObjectPath(inst, path("TEST_Thing"));
+    EXPECT_EQ(set(inst, "Name", "two", CMPI_chars), CMPI_RC_OK);
+    EXPECT_EQ(set(inst, "Size", nullptr, CMPI_uint16), CMPI_RC_OK);
+    EXPECT_EQ(inst->ft->getPropertyCount(inst, nullptr), 3U);
 }
 
 TEST_F(DeclaredClassTest, A_clone_keeps_to_the_class_too) {

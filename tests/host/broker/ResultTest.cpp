@@ -40,6 +40,39 @@ TEST_F(ResultTest, An_instance_is_taken_at_once) {
     EXPECT_EQ(instances[1].property("Color")->asString(), "blue");
 }
 
+// What is delivered is filled again for the next one.
+TEST_F(ResultTest, Instances_of_any_shape_follow_each_other) {
+    const auto result = make(Kind::Instances);
+    CMPIValue number = uint32Value(5);
+    std::vector<CMPIInstance*> made = {red(), instance(), red(), instance()};
+    made[1]->ft->setProperty(made[1], "Length", &number, CMPI_uint32);
+    made[2]->ft->setPropertyWithOrigin(made[2], "Color", nullptr, CMPI_string, "TEST_Base");
+    CMPIValue array = {};
+    array.array = mb()->eft->newArray(mb(), 2, CMPI_string, nullptr);
+    made[3]->ft->setProperty(made[3], "Color", &array, CMPI_stringA);
+    CMPIObjectPath* other = mb()->eft->newObjectPath(mb(), "root/other", "TEST_Other", nullptr);
+    other->ft->addKey(other, "Id", chars("7"), CMPI_chars);
+    made[3]->ft->setObjectPath(made[3], other);
+    made.push_back(red());
+    for (CMPIInstance* inst : made) {
+        EXPECT_EQ(CMReturnInstance(&result->cmpi, inst).rc, CMPI_RC_OK);
+    }
+    ASSERT_EQ(instances.size(), made.size());
+    for (std::size_t i = 0; i < made.size(); ++i) {
+        const cim::Instance alone = toCim(*liveObject<InstanceObject>(made[i]));
+        EXPECT_EQ(instances[i], alone) << i;
+        EXPECT_EQ(instances[i].path().nameSpace(), alone.path().nameSpace()) << i;
+    }
+    EXPECT_EQ(instances[1].properties().size(), 1U);
+    EXPECT_EQ(instances[2].properties()[0].origin, "TEST_Base");
+    EXPECT_TRUE(instances[2].properties()[0].value.isNull());
+    EXPECT_TRUE(instances[3].properties()[0].value.isArray());
+    EXPECT_EQ(instances[3].properties()[0].origin, "");
+    EXPECT_EQ(instances[3].path().toText(), "root/other:TEST_Other.Id=\"7\"");
+    EXPECT_TRUE(instances[4].path().keys().empty());
+    EXPECT_EQ(instances[4].property("Size")->asString(), "big");
+}
+
 TEST_F(ResultTest, Only_wanted_properties_are_delivered) {
     const auto result = make(Kind::Instances);
     result->properties = std::vector<std::string>{"SIZE"};

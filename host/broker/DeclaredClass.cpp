@@ -24,6 +24,7 @@ DeclaredClass::DeclaredClass(const cim::Class& declared)
     for (const cim::PropertyDeclaration& property : declared.properties) {
         DeclaredProperty entry;
         entry.name = property.name;
+        entry.object = newString(names_, property.name, Ownership::Contained);
         entry.hash = nameHash(property.name);
         entry.type = cmpiType(property.type, property.array);
         entry.key = cim::hasFlag(property.qualifiers, "Key");

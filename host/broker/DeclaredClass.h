@@ -2,6 +2,8 @@
 // sets: names by their hash, types as CMPI has them.
 #pragma once
 
+#include "Arena.h"
+
 #include <cim/Class.h>
 
 #include <cmpi/cmpidt.h>
@@ -15,7 +17,8 @@
 namespace qelo::broker {
 
 struct DeclaredProperty {
-    std::string_view name; // empty: an unused place of the table
+    std::string_view name;          // empty: an unused place of the table
+    StringObject* object = nullptr; // the name, for instances
     std::uint32_t hash = 0;
     CMPIType type = CMPI_null;
     bool key = false;
@@ -29,7 +32,7 @@ struct DeclaredProperty {
 };
 
 // Immutable but for what it learns of the order in which providers set properties. Safe to use from
-// several threads. The class must outlive it.
+// several threads. The class must outlive it, and it the instances.
 class DeclaredClass {
 public:
     explicit DeclaredClass(const cim::Class& declared);
@@ -52,6 +55,7 @@ private:
         return property ? static_cast<std::size_t>(property - table_.data()) : table_.size();
     }
 
+    Arena names_;
     std::vector<DeclaredProperty> table_; // open addressing; the size is a power of two
     // Of each place of the table, and of the beginning.
     mutable std::vector<std::atomic<const DeclaredProperty*>> followers_;

@@ -142,6 +142,7 @@ InstanceObject* newInstance(Arena& arena, const ObjectPathObject& path, Ownershi
 void setProperty(InstanceObject& instance, std::string_view name, CMPIData data,
                  StringObject* origin) {
     const DeclaredProperty* declared = expectedProperty(instance, name);
+    StringObject* const object = declared ? declared->object : nullptr;
     const std::uint32_t hash = declared ? declared->hash : nameHash(name);
     if (!declared && instance.declared) {
         declared = instance.declared->find(name, hash);
@@ -151,7 +152,7 @@ void setProperty(InstanceObject& instance, std::string_view name, CMPIData data,
     if (instance.filtered && !instance.filter.has(name, hash)) {
         return;
     }
-    instance.properties.set(*instance.arena, name, hash, data, origin);
+    instance.properties.set(*instance.arena, EntryName{name, hash, object}, data, origin);
     noteSet(instance, declared);
     instance.arena->notePropertyCount(instance.properties.size());
 }

@@ -55,14 +55,15 @@ const Entry* EntryList::find(std::string_view name) const {
     return const_cast<EntryList*>(this)->find(name, nameHash(name));
 }
 
-void EntryList::set(Arena& arena, std::string_view name, std::uint32_t hash, const CMPIData& data,
+void EntryList::set(Arena& arena, const EntryName& name, const CMPIData& data,
                     StringObject* origin) {
-    if (Entry* entry = find(name, hash)) {
+    if (Entry* entry = find(name.text, name.hash)) {
         entry->data = data;
         entry->origin = origin;
         return;
     }
-    append(arena, Entry{arena.name(name, hash), hash, data, origin});
+    StringObject* const object = name.object ? name.object : arena.name(name.text, name.hash);
+    append(arena, Entry{object, name.hash, data, origin});
 }
 
 void NameSet::add(Arena& arena, std::string_view name) {

@@ -82,6 +82,13 @@ struct Entry {
     StringObject* origin; // the class a property comes from, or null
 };
 
+// How a new entry is called.
+struct EntryName {
+    std::string_view text;
+    std::uint32_t hash;
+    StringObject* object; // that text where it lives as long as the list, or null
+};
+
 class EntryList {
 public:
     std::size_t size() const { return entries_.size(); }
@@ -99,7 +106,10 @@ public:
         set(arena, name, nameHash(name), data, nullptr);
     }
     void set(Arena& arena, std::string_view name, std::uint32_t hash, const CMPIData& data,
-             StringObject* origin);
+             StringObject* origin) {
+        set(arena, EntryName{name, hash, nullptr}, data, origin);
+    }
+    void set(Arena& arena, const EntryName& name, const CMPIData& data, StringObject* origin);
     // Whoever appends knows that there is none of that name.
     void append(Arena& arena, const Entry& entry) {
         entries_.append(arena, entry);

@@ -77,10 +77,12 @@ void appendValue(std::string& out, const cim::Value& value) {
 
 void addType(Pieces& out, std::string_view attribute, cim::Type type) {
     const bool embedded = type == cim::Type::Instance;
-    out.addAttribute(attribute, embedded ? "string" : cim::typeName(type));
-    if (embedded) {
-        out.add(" EmbeddedObject=\"instance\"");
-    }
+    // Nothing in these names needs an escape.
+    out.add(" ");
+    out.add(attribute);
+    out.add("=\"");
+    out.add(embedded ? "string" : cim::typeName(type));
+    out.add(embedded ? "\" EmbeddedObject=\"instance\"" : "\"");
 }
 
 void appendType(std::string& out, std::string_view attribute, cim::Type type) {

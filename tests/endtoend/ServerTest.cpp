@@ -5,6 +5,8 @@
 
 #include <gmock/gmock.h>
 
+#include <fstream>
+#include <iterator>
 #include <sys/stat.h>
 
 namespace qelo::endtoend {
@@ -149,6 +151,26 @@ TEST_F(ServedDatabase, Tls_protects_the_connection) {
     const Finished stock =
         runProcess({"wbemcli", "ein", "-noverify", server_->object("root/cimv2:ZANTH_Group")});
     EXPECT_THAT(stock.out, HasSubstr("adm"));
+}
+
+std::string contentOf(const std::string& path) {
+    std::ifstream file(path, std::ios::binary);
+    return {std::istreambuf_iterator<char>(file), {}};
+}
+
+// It starts itself a second time, for memory's sake.
+TEST_F(ServedDatabase, Is_the_process_that_was_started_with_its_arguments) {
+    users_ = scratch.write("two words", userLine("root", "rootpass"));
+    serve({"--user-file", users_});
+    const std::string process = "/proc/" + std::to_string(server_->process());
+    EXPECT_EQ(contentOf(process + "/comm"), "qelosim\n");
+    const std::string between(1, '\0');
+    EXPECT_THAT(contentOf(process + "/cmdline"),
+                HasSubstr(between + "--user-file" + between + users_ + between));
+    EXPECT_EQ(remote({"groups"}, "root:rootpass").status, 0);
+    if (const std::string environment = contentOf(process + "/environ"); !environment.empty()) {
+        EXPECT_THAT(environment, HasSubstr("glibc.malloc.tcache_max="));
+    }
 }
 
 TEST_F(ServedDatabase, Ends_when_it_is_told_to) {

@@ -120,7 +120,6 @@ protected:
         }
         const std::string config = scratch_.write("logging.conf", "log = none\n");
         setenv("QELO_LOG_CONFIG", config.c_str(), 1);
-        setenv("GLIBC_TUNABLES", "glibc.malloc.tcache_max=256", 1); // as the service's unit does
         const std::string users = scratch_.write("users", endtoend::userLine("root", "rootpass"));
         server_ = std::make_unique<Server>(
             std::vector<std::string>{"--user-file", users, "--root", root_});

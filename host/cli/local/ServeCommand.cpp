@@ -3,6 +3,7 @@
 #include "../render/Display.h"
 #include "ListenAddress.h"
 #include "LocalProviders.h"
+#include "ThreadCaches.h"
 
 #include <server/HttpServer.h>
 #include <server/Permissions.h>
@@ -170,6 +171,7 @@ server::ServerOptions serverOptionsOf(const ServeOptions& options, const ListenA
 }
 
 void serve(CommandContext& context, const ServeOptions& options) {
+    limitThreadCaches();
     // Memory of a large answer is to go back to the system; with an arena for each worker much
     // of it would stay.
     mallopt(M_ARENA_MAX, 2);

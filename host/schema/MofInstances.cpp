@@ -1,7 +1,6 @@
 // Static instances.
 #include "MofParser.h"
 
-#include <utility>
 
 namespace qelo::schema {
 
@@ -45,7 +44,7 @@ void MofParser::instanceDeclaration() {
     }
     tokens_.expectSymbol(';');
     at(position, [&] {
-        const cim::ObjectPath path = repository.add(compilation_.nameSpace(), std::move(instance));
+        const cim::ObjectPath path = repository.add(compilation_.nameSpace(), instance);
         if (!alias.empty()) {
             compilation_.setAlias(alias, path);
         }

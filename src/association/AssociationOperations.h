@@ -42,6 +42,14 @@ inline void addReferenceKey(CMPIObjectPath* own, const char* role, CMPIObjectPat
     own->ft->addKey(own, role, &value, CMPI_ref);
 }
 
+// Passes on whether an enumeration came whole, and says so when it did not.
+inline bool wholeOrSaid(const MarkerLines& lines, bool whole) {
+    if (!whole) {
+        lines.failed(association::enumerationFailed);
+    }
+    return whole;
+}
+
 // Visits every pair of a far path and one of the factory's near paths, far ones outermost,
 // until `visit(far, near)` returns false. `noNear` is said when the near paths cannot be had.
 // Returns false when a step failed; `status` is then what it left.
@@ -63,7 +71,7 @@ bool forEachPair(const MarkerLines& lines, const AssociationRequest& request,
         return false;
     }
     bool going = true;
-    forEachPath(farPaths, [&](CMPIObjectPath* far) {
+    const bool whole = forEachPath(farPaths, status, [&](CMPIObjectPath* far) {
         std::vector<CMPIObjectPath*> nearPaths;
         if (factory.allPaths(request.broker, request.ref, nearPaths, status) != 0) {
             lines.failed(noNear);
@@ -80,7 +88,7 @@ bool forEachPair(const MarkerLines& lines, const AssociationRequest& request,
         }
         return going;
     });
-    return going;
+    return wholeOrSaid(lines, whole) && going;
 }
 
 // A new path of the association's own class, or null with the failure said.
@@ -106,7 +114,8 @@ bool buildInstances(const MarkerLines& lines, const AssociationRequest& request,
         if (own == nullptr) {
             return false;
         }
-        CMPIInstance* instance = CMNewInstance(request.broker, own, status);
+        CMPIStatus aside = succeeded; // one that cannot be made is left out, and that is all
+        CMPIInstance* instance = CMNewInstance(request.broker, own, &aside);
         if (!isNull(instance)) {
             const char* keys[] = {shape.farRole, shape.nearRole, nullptr};
             CMSetPropertyFilter(instance, request.properties, keys);

@@ -47,11 +47,10 @@ bool forEachFarPath(const MarkerLines& lines, const AssociationRequest& request,
         lines.failed(association::enumerationFailed);
         return false;
     }
-    forEachPath(paths, [&](CMPIObjectPath* path) {
-        visit(path);
-        return true;
-    });
-    return true;
+    return wholeOrSaid(lines, forEachPath(paths, status, [&](CMPIObjectPath* path) {
+                           visit(path);
+                           return true;
+                       }));
 }
 
 inline bool returnFarInstances(const MarkerLines& lines, const AssociationRequest& request,
@@ -62,13 +61,13 @@ inline bool returnFarInstances(const MarkerLines& lines, const AssociationReques
         lines.failed(association::enumerationFailed);
         return false;
     }
-    forEachElement(instances, CMPI_instance, [&](const CMPIValue& value) {
+    const auto give = [&](const CMPIValue& value) {
         if (!isNull(value.inst)) {
             CMReturnInstance(request.result, value.inst);
         }
         return true;
-    });
-    return true;
+    };
+    return wholeOrSaid(lines, forEachElement(instances, CMPI_instance, status, give));
 }
 
 template <class Factory>

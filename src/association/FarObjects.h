@@ -16,27 +16,36 @@ inline bool enumerationFailed(const CMPIEnumeration* enumeration, CMPIStatus* st
 }
 
 // Calls `visit(element)` for each element of that type, in order, until it returns false or
-// the enumeration ends or fails. Elements without a value are passed over.
+// the enumeration ends. Elements without a value are passed over. False when the enumeration
+// failed on the way, `status` then being the broker's: a part is not to pass for the whole.
 template <class Visit>
-void forEachElement(const CMPIEnumeration* enumeration, CMPIType type, Visit visit) {
-    CMPIStatus status = {CMPI_RC_OK, nullptr};
-    while (enumeration->ft->hasNext(enumeration, &status) != 0 && status.rc == CMPI_RC_OK) {
-        const CMPIData element = enumeration->ft->getNext(enumeration, &status);
-        if (status.rc != CMPI_RC_OK) {
-            return;
+bool forEachElement(const CMPIEnumeration* enumeration, CMPIType type, CMPIStatus* status,
+                    Visit visit) {
+    CMPIStatus step = {CMPI_RC_OK, nullptr};
+    while (enumeration->ft->hasNext(enumeration, &step) != 0 && step.rc == CMPI_RC_OK) {
+        const CMPIData element = enumeration->ft->getNext(enumeration, &step);
+        if (step.rc != CMPI_RC_OK) {
+            break;
         }
         const bool usable =
             element.type == type && (element.state & (CMPI_nullValue | CMPI_badValue)) == 0;
         if (usable && !visit(element.value)) {
-            return;
+            return true;
         }
     }
+    if (step.rc != CMPI_RC_OK) {
+        *status = step;
+        return false;
+    }
+    return true;
 }
 
 // The same for object paths, null ones left out.
-template <class Visit> void forEachPath(const CMPIEnumeration* enumeration, Visit visit) {
-    forEachElement(enumeration, CMPI_ref,
-                   [&](const CMPIValue& value) { return isNull(value.ref) || visit(value.ref); });
+template <class Visit>
+bool forEachPath(const CMPIEnumeration* enumeration, CMPIStatus* status, Visit visit) {
+    return forEachElement(enumeration, CMPI_ref, status, [&](const CMPIValue& value) {
+        return isNull(value.ref) || visit(value.ref);
+    });
 }
 
 } // namespace SimpleIdentityManagementProvider

@@ -162,7 +162,8 @@ CMPIStatus getInstanceByKeyOrAll(Lines lines, const InstanceRequest& request) {
         lines.enter();
         Class::refresh();
         CMPIStatus status = succeeded;
-        if (!hasKeys(request.ref, &status)) {
+        CMPIStatus aside = succeeded;
+        if (!hasKeys(request.ref, &aside)) {
             status = makeStatus(request.broker, CMPI_RC_ERR_FAILED, keyMissingText);
             traceToBroker(request.broker, 2, Class::component, keyMissingText);
             return status;

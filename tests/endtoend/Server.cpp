@@ -115,7 +115,8 @@ std::string Server::object(const std::string& path, const std::string& credentia
 }
 
 std::uint16_t Server::port() const {
-    return static_cast<std::uint16_t>(std::atoi(url_.substr(url_.rfind(':') + 1).c_str()));
+    return url_.empty() ? std::uint16_t{0}
+                        : static_cast<std::uint16_t>(std::stoul(url_.substr(url_.rfind(':') + 1)));
 }
 
 std::string userLine(const std::string& user, const std::string& password) {

@@ -25,7 +25,7 @@ std::size_t columnsOf(const std::string& line) {
 
 TEST_F(Terminal, A_table_fits_into_the_terminal_at_any_width) {
     const Variables plain = {{"NO_COLOR", "1"}, {"LC_ALL", "C.UTF-8"}};
-    for (const std::size_t columns : {10, 30, 40, 60, 66, 80}) {
+    for (const std::size_t columns : {10U, 30U, 40U, 60U, 66U, 80U}) {
         const Finished finished =
             runOnTerminal(columns, qelosimCommand({"accounts", "--store", store()}), plain);
         EXPECT_EQ(finished.status, 0) << finished.err;

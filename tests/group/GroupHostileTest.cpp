@@ -64,7 +64,7 @@ TEST_F(HostileGroups, A_name_of_600_characters_may_be_asked_for_in_vain) {
 TEST_F(HostileGroups, Half_a_megabyte_of_members_is_served_whole_and_traced_cut) {
     std::vector<std::string> members;
     std::string joined;
-    while (joined.size() < 512 * 1024) {
+    while (joined.size() < 512UL * 1024) {
         members.push_back("member" + std::to_string(members.size()));
         joined += (joined.empty() ? "" : ",") + members.back();
     }
@@ -75,7 +75,7 @@ TEST_F(HostileGroups, Half_a_megabyte_of_members_is_served_whole_and_traced_cut)
 }
 
 TEST_F(HostileGroups, One_member_of_half_a_megabyte_is_served_whole) {
-    const std::string member(512 * 1024, 'm');
+    const std::string member(512UL * 1024, 'm');
     serve({groupNode("wheel", {member, "b"})});
     expectOk(getInstance(groupKeys("wheel")));
     EXPECT_EQ(onlyInstance().propertyText("GroupMembers"), member + ",b");
@@ -84,7 +84,7 @@ TEST_F(HostileGroups, One_member_of_half_a_megabyte_is_served_whole) {
 
 TEST_F(HostileGroups, A_method_name_and_arguments_of_any_length_stay_within_bounds) {
     serve({groupNode("wheel")});
-    const std::string longText(512 * 1024, 'x');
+    const std::string longText(512UL * 1024, 'x');
     expectOk(invoke(longText.c_str(), broker_.makeArgs().string(longText, longText)));
     EXPECT_EQ(platform_.commands().at(0).size(), 1023U);
     EXPECT_EQ(longestLine(), 511U);

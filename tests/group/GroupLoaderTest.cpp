@@ -14,8 +14,6 @@ using Tesk::SimpleIdentityManagementProvider::setVector;
 using Tesk::SimpleIdentityManagementProvider::SimGroup;
 using testing::Contains;
 using testing::ElementsAre;
-using testing::ElementsAreArray;
-using testing::IsEmpty;
 
 class GroupLoader : public testing::Test {
 protected:

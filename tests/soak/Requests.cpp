@@ -79,69 +79,104 @@ std::size_t Requests::any(std::size_t count) {
     return std::uniform_int_distribution<std::size_t>(0, count - 1)(random_);
 }
 
+Request Requests::asked(std::pair<Post, Reply> choice) const {
+    choice.first.credentials = credentials_;
+    return {choice.first.text(), Ending::Answered, 200, choice.second};
+}
+
 std::string Requests::anyAccount() { return accounts_[any(accounts_.size())]; }
 
-Request Requests::operation() {
+Request Requests::operation() { return any(2) == 0 ? onClass() : onInstance(); }
+
+Request Requests::onClass() {
     const std::string& className = classes()[any(classes().size())];
-    const std::string account = any(4) == 0 ? "nobody-here" : anyAccount();
+    const Reply reply = className == "ZANTH_Nothing" ? Reply::Error : Reply::Result;
+    const std::string deep = any(2) == 0 ? "true" : "false";
+    const std::vector<std::pair<Post, Reply>> choice = {
+        {intrinsic("EnumerateInstances", classNameParameter(className)), reply},
+        {intrinsic("EnumerateInstanceNames", classNameParameter(className)), reply},
+        {intrinsic("EnumerateInstances", classNameParameter(className), "root/nowhere"),
+         Reply::Error},
+        {intrinsic("GetClass", classNameParameter(className)), reply},
+        {intrinsic("EnumerateClasses", textParameter("DeepInheritance", deep)), Reply::Result},
+        {intrinsic("EnumerateClassNames", textParameter("DeepInheritance", deep)), Reply::Result},
+        {intrinsic("GetQualifier", textParameter("QualifierName", "Key")), Reply::Result},
+        {intrinsic("EnumerateQualifiers", ""), Reply::Result},
+        {intrinsic("ExecQuery", textParameter("QueryLanguage", "WQL") +
+                                    textParameter("Query", "select * from ZANTH_Account")),
+         Reply::Error},
+        {intrinsic("Nonsense", ""), Reply::Error},
+    };
+    return asked(choice[any(choice.size())]);
+}
+
+Request Requests::onInstance() {
+    const bool unknown = any(4) == 0;
+    const Reply reply = unknown ? Reply::Error : Reply::Result;
+    const std::string account = unknown ? "nobody-here" : anyAccount();
     const std::string path = instanceName("ZANTH_Account", account);
     const std::string service = instanceName("ZANTH_AccountManagementService", account);
-    const std::string deep = any(2) == 0 ? "true" : "false";
-    const std::vector<Post> posts = {
-        intrinsic("EnumerateInstances", classNameParameter(className)),
-        intrinsic("EnumerateInstanceNames", classNameParameter(className)),
-        intrinsic("EnumerateInstances", classNameParameter(className), "root/nowhere"),
-        intrinsic("GetInstance", parameter("InstanceName", path)),
-        intrinsic("GetInstance", parameter("InstanceName", path) +
-                                     parameter("PropertyList", "<VALUE.ARRAY><VALUE>UserID</VALUE>"
-                                                               "</VALUE.ARRAY>")),
-        intrinsic("GetProperty",
-                  parameter("InstanceName", path) + textParameter("PropertyName", "UserID")),
-        intrinsic("SetProperty", parameter("InstanceName", path) +
-                                     textParameter("PropertyName", "UserID") +
-                                     textParameter("NewValue", "1")),
-        intrinsic("Associators", parameter("ObjectName", service)),
-        intrinsic("AssociatorNames", parameter("ObjectName", service)),
-        intrinsic("References", parameter("ObjectName", service)),
-        intrinsic("ReferenceNames", parameter("ObjectName", path)),
-        intrinsic("GetClass", classNameParameter(className)),
-        intrinsic("EnumerateClasses", textParameter("DeepInheritance", deep)),
-        intrinsic("EnumerateClassNames", textParameter("DeepInheritance", deep)),
-        intrinsic("GetQualifier", textParameter("QualifierName", "Key")),
-        intrinsic("EnumerateQualifiers", ""),
-        intrinsic("CreateInstance", parameter("NewInstance", newInstance(account))),
-        intrinsic("DeleteInstance", parameter("InstanceName", path)),
-        intrinsic("ModifyInstance", parameter("ModifiedInstance", "<VALUE.NAMEDINSTANCE>" + path +
-                                                                      newInstance(account) +
-                                                                      "</VALUE.NAMEDINSTANCE>")),
-        intrinsic("ExecQuery", textParameter("QueryLanguage", "WQL") +
-                                   textParameter("Query", "select * from ZANTH_Account")),
-        intrinsic("Nonsense", ""),
+    const std::string list =
+        parameter("PropertyList", "<VALUE.ARRAY><VALUE>UserID</VALUE></VALUE.ARRAY>");
+    const std::string property = textParameter("PropertyName", "UserID");
+    const std::vector<std::pair<Post, Reply>> choice = {
+        {intrinsic("GetInstance", parameter("InstanceName", path)), reply},
+        {intrinsic("GetInstance", parameter("InstanceName", path) + list), reply},
+        {intrinsic("GetProperty", parameter("InstanceName", path) + property), reply},
+        {intrinsic("SetProperty",
+                   parameter("InstanceName", path) + property + textParameter("NewValue", "1")),
+         Reply::Error},
+        {intrinsic("Associators", parameter("ObjectName", service)), Reply::Result},
+        {intrinsic("AssociatorNames", parameter("ObjectName", service)), Reply::Result},
+        {intrinsic("References", parameter("ObjectName", service)), Reply::Result},
+        {intrinsic("ReferenceNames", parameter("ObjectName", path)), Reply::Result},
+        {intrinsic("CreateInstance", parameter("NewInstance", newInstance(account))), Reply::Error},
+        {intrinsic("DeleteInstance", parameter("InstanceName", path)), Reply::Error},
+        {intrinsic("ModifyInstance", parameter("ModifiedInstance", "<VALUE.NAMEDINSTANCE>" + path +
+                                                                       newInstance(account) +
+                                                                       "</VALUE.NAMEDINSTANCE>")),
+         Reply::Error},
     };
-    Post post = posts[any(posts.size())];
-    post.credentials = credentials_;
-    return {post.text()};
+    return asked(choice[any(choice.size())]);
 }
 
 // Changes are made by the tools of the system, which takes its time; most are refused before.
 Request Requests::method() {
-    const std::string name = argument("Name", anyAccount());
+    if (any(20) == 0) {
+        return change();
+    }
     const std::vector<Post> posts = {
         extrinsic("ZANTH_Account", "DeleteUser", argument("Name", "root")),
         extrinsic("ZANTH_Account", "ModifyUser", argument("Name", "nobody-here")),
         extrinsic("ZANTH_Account", "SetPassword",
                   argument("Name", "nobody-here") + argument("UserPassword", "xyzzy plugh")),
         extrinsic("ZANTH_Account", "CreateUser", argument("Name", "Bad:Name")),
-        extrinsic("ZANTH_Account", "Nonsense", name),
+        extrinsic("ZANTH_Account", "Nonsense", argument("Name", anyAccount())),
         extrinsic("ZANTH_Group", "DeleteGroup", argument("Name", "none")),
         extrinsic("ZANTH_Nothing", "DeleteGroup", argument("Name", "none")),
-        extrinsic("ZANTH_Account", "ModifyUser",
-                  name + argument("FullName", "Number " + std::to_string(any(1000)))),
     };
-    // The last one, which is carried out, is rare.
-    Post post = any(20) == 0 ? posts.back() : posts[any(posts.size() - 1)];
-    post.credentials = credentials_;
-    return {post.text()};
+    return asked({posts[any(posts.size())], Reply::Error});
+}
+
+// Whether it is refused depends on what other clients did before.
+Request Requests::change() {
+    const std::string account = argument("Name", anyAccount());
+    const std::string guest = argument("Name", "guest" + std::to_string(any(4)));
+    const std::vector<Post> posts = {
+        extrinsic("ZANTH_Account", "ModifyUser",
+                  account + argument("FullName", "Number " + std::to_string(any(1000)))),
+        extrinsic("ZANTH_Account", "SetPassword", account + argument("UserPassword", "xyzzy")),
+        extrinsic("ZANTH_Account", "DisableUser", account),
+        extrinsic("ZANTH_Account", "CreateUser", guest),
+        extrinsic("ZANTH_Account", "DeleteUser", guest),
+        extrinsic("ZANTH_Group", "CreateGroup", argument("Name", "guests")),
+        extrinsic("ZANTH_Group", "AddMember",
+                  argument("Name", "guests") + argument("Member", anyAccount())),
+        extrinsic("ZANTH_Group", "DeleteGroup", argument("Name", "guests")),
+    };
+    Request request = asked({posts[any(posts.size())], Reply::Any});
+    request.change = true;
+    return request;
 }
 
 Request Requests::malformed() {

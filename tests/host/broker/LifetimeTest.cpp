@@ -121,7 +121,12 @@ protected:
 
 using Kinds = ::testing::Types<StringKind, ArrayKind, ObjectPathKind, InstanceKind, ArgsKind,
                                DateTimeKind, EnumerationKind, ErrorKind>;
-TYPED_TEST_SUITE(LifetimeTest, Kinds);
+
+// The macro wants an argument where the names of the kinds may stand.
+struct KindNames {
+    template <class Kind> static std::string GetName(int number) { return std::to_string(number); }
+};
+TYPED_TEST_SUITE(LifetimeTest, Kinds, KindNames);
 
 TYPED_TEST(LifetimeTest, A_live_object_has_a_handle_and_a_table_of_version_200) {
     auto* object = this->make();

@@ -21,7 +21,7 @@ inline cim::ObjectPath samplePath(const std::string& nameSpace = "root/cimv2") {
     path.setKey("Number", Value::unsignedInteger(Type::UInt16, 5));
     path.setKey("Below", Value::signedInteger(Type::SInt8, -5));
     path.setKey("Flag", Value::boolean(true));
-    path.setKey("Real", Value::real(Type::Real32, 0.1F));
+    path.setKey("Real", Value::real(Type::Real32, static_cast<double>(0.1F)));
     path.setKey("Letter", Value::unsignedInteger(Type::Char16, 0xE4));
     path.setKey("When", Value::dateTime(*cim::DateTime::parse("20261121053000.000000+060")));
     path.setKey("End", Value::reference(std::move(end)));
@@ -48,7 +48,7 @@ inline cim::Instance sampleInstance(cim::ObjectPath path = samplePath()) {
     instance.setProperty("U8", Value::unsignedInteger(Type::UInt8, 255));
     instance.setProperty("U64", Value::unsignedInteger(Type::UInt64, UINT64_MAX));
     instance.setProperty("S64", Value::signedInteger(Type::SInt64, INT64_MIN));
-    instance.setProperty("R32", Value::real(Type::Real32, 0.1F));
+    instance.setProperty("R32", Value::real(Type::Real32, static_cast<double>(0.1F)));
     instance.setProperty("R64", Value::real(Type::Real64, 1e300));
     instance.setProperty("Infinite", Value::real(Type::Real64, -INFINITY));
     instance.setProperty("When",

@@ -40,7 +40,7 @@ struct Pipe {
 class FileOutputTest : public ::testing::Test {
 protected:
     void SetUp() override { previous_ = std::signal(SIGPIPE, SIG_IGN); }
-    void TearDown() override { std::signal(SIGPIPE, previous_); }
+    void TearDown() override { (void)std::signal(SIGPIPE, previous_); }
 
 private:
     void (*previous_)(int) = SIG_DFL;

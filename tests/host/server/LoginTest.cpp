@@ -37,7 +37,7 @@ protected:
         close(descriptor);
         path_ = name;
     }
-    void TearDown() override { std::remove(path_.c_str()); }
+    void TearDown() override { (void)std::remove(path_.c_str()); }
     void write(const std::string& text) const { std::ofstream(path_) << text; }
 
     std::string problem() const {
@@ -101,7 +101,7 @@ TEST_F(UserFileTest, A_file_that_others_may_write_is_refused) {
 }
 
 TEST_F(UserFileTest, A_missing_file_is_named) {
-    std::remove(path_.c_str());
+    ASSERT_EQ(std::remove(path_.c_str()), 0);
     EXPECT_NE(problem().find("cannot read " + path_), std::string::npos) << problem();
 }
 

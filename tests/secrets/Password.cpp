@@ -2,6 +2,8 @@
 
 #include "host/server/RawClient.h"
 
+#include <cim/Utf8.h>
+
 #include <cctype>
 #include <random>
 
@@ -20,11 +22,25 @@ std::string random(std::size_t length) {
     return text;
 }
 
+// In units of so many bytes; no character here needs two of them.
 std::string wide(const std::string& text, std::size_t width, bool bigEndian) {
-    const std::string padding(width - 1, '\0');
+    std::string result;
+    for (std::size_t position = 0; position < text.size();) {
+        const auto character = cim::decodeUtf8(text, position).value();
+        position += character.length;
+        std::string unit(width, '\0');
+        unit[bigEndian ? width - 1 : 0] = static_cast<char>(character.code & 0xFFU);
+        unit[bigEndian ? width - 2 : 1] = static_cast<char>(character.code >> 8U);
+        result += unit;
+    }
+    return result;
+}
+
+// As JSON and C have it within quotes.
+std::string escaped(const std::string& text) {
     std::string result;
     for (const char c : text) {
-        result += bigEndian ? padding + c : c + padding;
+        result += c == '"' || c == '\\' ? std::string("\\") + c : std::string(1, c);
     }
     return result;
 }
@@ -48,7 +64,11 @@ Password::Password(std::string text) : text_(std::move(text)) {
     forms_ = {{"plain", text_},
               {"UTF-16LE", wide(text_, 2, false)},
               {"UTF-16BE", wide(text_, 2, true)},
-              {"UTF-32LE", wide(text_, 4, false)}};
+              {"UTF-32LE", wide(text_, 4, false)},
+              {"UTF-32BE", wide(text_, 4, true)}};
+    if (escaped(text_) != text_) {
+        forms_.emplace_back("escaped", escaped(text_));
+    }
     for (const std::size_t before : {0, 1, 2}) {
         forms_.emplace_back("base64, " + std::to_string(before) + " before",
                             base64Behind(before, text_));

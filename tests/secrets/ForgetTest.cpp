@@ -75,7 +75,8 @@ __attribute__((noinline)) std::uintptr_t crossStack() {
     for (volatile char& c : deep) {
         c = 'x';
     }
-    return reinterpret_cast<std::uintptr_t>(&deep[0]);
+    const auto place = reinterpret_cast<std::uintptr_t>(&deep[0]);
+    return place; // for looking at what is left there
 }
 
 __attribute__((noinline)) std::uintptr_t crossHeap() {

@@ -69,7 +69,7 @@ Password::Password(std::string text) : text_(std::move(text)) {
     if (escaped(text_) != text_) {
         forms_.emplace_back("escaped", escaped(text_));
     }
-    for (const std::size_t before : {0, 1, 2}) {
+    for (const std::size_t before : {0U, 1U, 2U}) {
         forms_.emplace_back("base64, " + std::to_string(before) + " before",
                             base64Behind(before, text_));
     }

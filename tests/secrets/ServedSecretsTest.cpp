@@ -28,6 +28,11 @@ protected:
                          "superuser can read it\n";
             return;
         }
+        if (!memoryTells()) {
+            std::cout << "[   NOTE   ] the memory of the server is not searched: a sanitizer keeps "
+                         "what is freed\n";
+            return;
+        }
         EXPECT_EQ(placesThatStay(server().process(), password), "");
     }
     void expectNothingLeft() {
@@ -238,6 +243,9 @@ TEST_F(ServedSecrets, Large_requests_leave_nothing) {
 TEST_F(ServedSecrets, The_search_finds_a_password_while_it_is_in_use) {
     if (geteuid() != 0) {
         GTEST_SKIP() << "only the superuser can read the memory of the server";
+    }
+    if (!memoryTells()) {
+        GTEST_SKIP() << "not with a sanitizer: its tables take too long to read";
     }
     start();
     const std::string text = setPassword(plain_.text()).text();

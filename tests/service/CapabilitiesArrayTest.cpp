@@ -6,9 +6,7 @@
 namespace qelo::test {
 namespace {
 
-using testing::Contains;
 using testing::ElementsAre;
-using testing::IsEmpty;
 
 constexpr const char* component = "SimAccountManagementCapabilitiesProvider";
 

@@ -8,7 +8,6 @@ namespace {
 
 using Factory = Tesk::SimpleIdentityManagementProvider::SimAccountManagementCapabilitiesFactory;
 using Tesk::SimpleIdentityManagementProvider::SimAccountManagementCapabilities;
-using testing::ElementsAre;
 using testing::IsEmpty;
 
 class CapabilitiesFactory : public testing::Test {

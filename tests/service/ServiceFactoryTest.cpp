@@ -8,7 +8,6 @@ namespace {
 
 using Factory = Tesk::SimpleIdentityManagementProvider::SimAccountManagementServiceFactory;
 using Tesk::SimpleIdentityManagementProvider::SimAccountManagementService;
-using testing::ElementsAre;
 using testing::IsEmpty;
 
 class ServiceFactory : public testing::Test {

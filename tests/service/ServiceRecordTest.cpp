@@ -9,7 +9,6 @@ namespace qelo::test {
 namespace {
 
 using Tesk::SimpleIdentityManagementProvider::SimAccountManagementService;
-using testing::Contains;
 
 const Unit& unit = source::service;
 

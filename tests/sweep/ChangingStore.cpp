@@ -189,7 +189,7 @@ void ChangingAccounts::change(std::uint64_t turn) {
 ChangingNodeFile::ChangingNodeFile(fs::path directory)
     : directory_(std::move(directory)), file_(directory_ / "nodes") {
     fs::create_directories(directory_);
-    for (const std::size_t population : {0, 1}) {
+    for (const std::size_t population : {0U, 1U}) {
         write(directory_ / std::string(1, letterOf(population)), nodesOf(population));
     }
     putState(0);

@@ -32,7 +32,7 @@ TEST(DateTime, The_separator_tells_an_interval_from_a_point_in_time) {
 TEST(DateTime, A_point_in_time_counts_from_1970) {
     EXPECT_EQ(microsecondsOf("19700101000000.000000+000"), 0U);
     EXPECT_EQ(microsecondsOf("19700101000001.000002+000"), kSecond + 2);
-    EXPECT_EQ(microsecondsOf("20140307123005.000000+000"), 1394195405ULL * kSecond);
+    EXPECT_EQ(microsecondsOf("20140307123005.000000+000"), 1394195405UL * kSecond);
     EXPECT_EQ(microsecondsOf("20000229000000.000000+000"), 951782400U * kSecond);
 }
 
@@ -53,9 +53,9 @@ TEST(DateTime, An_interval_counts_its_length) {
 }
 
 TEST(DateTime, Asterisks_count_as_the_lowest_value) {
-    EXPECT_EQ(microsecondsOf("2014**********.******+000"), 1388534400ULL * kSecond);
-    EXPECT_EQ(microsecondsOf("20140307123005.12****+000"), 1394195405ULL * kSecond + 120000);
-    EXPECT_EQ(microsecondsOf("00000002******.******:000"), 2ULL * 86400ULL * kSecond);
+    EXPECT_EQ(microsecondsOf("2014**********.******+000"), 1388534400UL * kSecond);
+    EXPECT_EQ(microsecondsOf("20140307123005.12****+000"), 1394195405UL * kSecond + 120000);
+    EXPECT_EQ(microsecondsOf("00000002******.******:000"), 2UL * 86400UL * kSecond);
 }
 
 TEST(DateTime, Asterisks_cover_whole_fields_from_the_right_only) {
@@ -105,11 +105,11 @@ TEST(DateTime, A_zero_byte_inside_is_refused) {
 TEST(DateTime, Microseconds_become_text_and_come_back) {
     for (const std::uint64_t micros :
          {std::uint64_t{0}, std::uint64_t{1}, 951782399U * kSecond + 999999, 951782400U * kSecond,
-          1394195405ULL * kSecond + 42, 253402300799U * kSecond + 999999}) {
+          1394195405UL * kSecond + 42, 253402300799U * kSecond + 999999}) {
         EXPECT_EQ(DateTime::fromMicroseconds(micros, false).microseconds(), micros);
         EXPECT_EQ(DateTime::fromMicroseconds(micros, true).microseconds(), micros);
     }
-    EXPECT_EQ(DateTime::fromMicroseconds(1394195405ULL * kSecond + 42, false).text(),
+    EXPECT_EQ(DateTime::fromMicroseconds(1394195405UL * kSecond + 42, false).text(),
               "20140307123005.000042+000");
     EXPECT_EQ(DateTime::fromMicroseconds(93784U * kSecond + 5, true).text(),
               "00000001020304.000005:000");

@@ -99,7 +99,8 @@ RawClient::Answer RawClient::receive(std::chrono::seconds patience) {
         }
         answer.header = buffer_.substr(0, headerEnd + 2);
         buffer_.erase(0, headerEnd + 4);
-        answer.status = std::atoi(answer.header.c_str() + answer.header.find(' '));
+        answer.status = static_cast<int>(
+            std::strtol(answer.header.c_str() + answer.header.find(' '), nullptr, 10));
     } while (answer.status == 100);
     if (answer.field("Transfer-Encoding") == "chunked") {
         readChunks(answer, end);

@@ -18,7 +18,7 @@ using qelo::server::ResponseStream;
 using qelo::server::SpaceBudget;
 using qelo::server::SpillFile;
 
-constexpr std::size_t kPlenty = 64 * 1024 * 1024;
+constexpr std::size_t kPlenty = 64UL * 1024 * 1024;
 
 // Bytes whose place can be told, so that a swap or a loss shows.
 std::string pattern(std::size_t from, std::size_t size) {

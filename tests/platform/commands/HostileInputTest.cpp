@@ -65,11 +65,11 @@ std::vector<std::string> hostileTexts() {
             "\xc0\xaf",
             "\xc3\x28",
             "\xed\xa0\x80",
-            "\xc2\x9b"
-            "31m",
+            ("\xc2\x9b"
+             "31m"),
             "caf\xc3\xa9",
-            "\xe2\x80\xae"
-            "drow",
+            ("\xe2\x80\xae"
+             "drow"),
             "root",
             "ROOT",
             "root ",

@@ -12,8 +12,6 @@ namespace {
 namespace fs = std::filesystem;
 
 using testing::AllOf;
-using testing::Contains;
-using testing::Field;
 using testing::HasSubstr;
 
 class Refusal : public CommandTest {

@@ -99,7 +99,7 @@ TEST_F(Secrecy, Moving_a_secret_leaves_nothing_behind) {
     const char* const bytes = first.text();
     store::Secret second(std::move(first));
     EXPECT_EQ(bytes, second.text());
-    EXPECT_TRUE(first.empty());
+    EXPECT_TRUE(first.empty()); // NOLINT(bugprone-use-after-move): that is the question
     EXPECT_STREQ("", first.text());
     first = std::move(second);
     EXPECT_EQ("top secret", first.view());

@@ -16,7 +16,6 @@ namespace {
 
 using store::ToolCall;
 using store::ToolResult;
-using testing::Not;
 
 // A tool of a test's own: a script with a fixed interpreter.
 class Tool : public testing::Test {

@@ -19,7 +19,6 @@ using namespace Tesk::NodeLexicon;
 using Tesk::Instrumentation;
 using testing::ElementsAre;
 using testing::HasSubstr;
-using testing::IsEmpty;
 
 class InstrumentationCursor : public testing::Test {
 protected:

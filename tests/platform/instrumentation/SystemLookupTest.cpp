@@ -152,7 +152,7 @@ TEST(SystemLookup, Sees_the_same_records_in_damaged_files) {
         const std::string difference =
             firstDifference(systemAccounts(), accounts) + firstDifference(systemGroups(), groups);
         if (!difference.empty()) {
-            std::fprintf(stderr, "%s\n", difference.c_str());
+            (void)std::fprintf(stderr, "%s\n", difference.c_str());
         }
         ::_exit(difference.empty() ? 0 : 1);
     };

@@ -20,7 +20,7 @@ protected:
             before[name] = value == nullptr ? std::nullopt : std::optional<std::string>(value);
             ::unsetenv(name);
         }
-        std::setlocale(LC_ALL, "C");
+        (void)std::setlocale(LC_ALL, "C");
     }
 
     ~LocaleTest() override {
@@ -31,7 +31,7 @@ protected:
                 ::unsetenv(name.c_str());
             }
         }
-        std::setlocale(LC_ALL, "C");
+        (void)std::setlocale(LC_ALL, "C");
     }
 
     static void set(const char* name, const char* value) { ::setenv(name, value, 1); }

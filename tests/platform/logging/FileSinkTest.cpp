@@ -166,12 +166,12 @@ void setFileSizeLimit(rlim_t bytes) {
 }
 
 TEST_F(FileSinkTest, A_line_cut_by_a_full_disk_does_not_run_into_the_next_one) {
-    std::signal(SIGXFSZ, SIG_IGN);
+    (void)std::signal(SIGXFSZ, SIG_IGN);
     Output output(fileAt(path));
     setFileSizeLimit(20);
     const auto failure = output.write(6000, "cut");
     setFileSizeLimit(RLIM_INFINITY);
-    std::signal(SIGXFSZ, SIG_DFL);
+    (void)std::signal(SIGXFSZ, SIG_DFL);
     EXPECT_NE(failure, std::nullopt);
     EXPECT_EQ(output.write(6000, "whole"), std::nullopt);
     const auto lines = linesOf(path);

@@ -35,9 +35,9 @@ void atExit() { logLine("exit handler"); }
 } // namespace
 
 int main() {
-    std::atexit(atExit);
+    (void)std::atexit(atExit);
     std::thread([] { logLine(inThread.begin); }).join();
     logLine(inThread.begin);
-    std::atexit([] { logLine("second exit handler"); });
+    (void)std::atexit([] { logLine("second exit handler"); });
     return 0;
 }

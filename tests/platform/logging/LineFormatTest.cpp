@@ -12,8 +12,6 @@ namespace {
 
 using namespace qelo::logging;
 using testing::EndsWith;
-using testing::HasSubstr;
-using testing::StartsWith;
 
 std::string escaped(std::string_view text, Blanks blanks = Blanks::Kept, std::size_t limit = 1000) {
     std::string out;
@@ -91,7 +89,7 @@ TEST(LineFormat, A_line_has_a_bounded_length_whatever_it_is_made_of) {
 }
 
 TEST(LineFormat, No_message_can_make_a_second_line_or_drive_a_terminal) {
-    std::mt19937 random(7);
+    std::mt19937 random(7); // NOLINT(cert-msc32-c,cert-msc51-cpp): the same each time
     for (int round = 0; round < 5000; ++round) {
         std::string message(random() % 40, '\0');
         std::generate(message.begin(), message.end(), [&] { return static_cast<char>(random()); });

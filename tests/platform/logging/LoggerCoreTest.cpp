@@ -14,7 +14,6 @@ namespace {
 using namespace qelo::logging;
 using namespace qelo::test;
 using namespace std::chrono_literals;
-using testing::ContainsRegex;
 using testing::EndsWith;
 using testing::HasSubstr;
 using testing::SizeIs;
@@ -155,7 +154,7 @@ TEST_F(LoggerCoreTest, A_configuration_that_is_no_regular_file_or_too_large_is_n
     core.refreshIfDue();
     EXPECT_EQ(threshold(core, Channel::Log), 6000);
     std::filesystem::remove(config);
-    configure("log.level = 1\n" + std::string(300 * 1024, '\n'));
+    configure("log.level = 1\n" + std::string(300UL * 1024, '\n'));
     core.refreshIfDue();
     EXPECT_EQ(threshold(core, Channel::Log), 6000);
 }

@@ -47,7 +47,7 @@ TEST(ValidateInput, What_is_not_UTF_8_is_refused) {
 TEST(ValidateInput, A_text_of_255_bytes_passes_and_a_longer_one_does_not) {
     EXPECT_TRUE(accepts(std::string(255, 'x')));
     EXPECT_FALSE(accepts(std::string(256, 'x')));
-    EXPECT_FALSE(accepts(std::string(100000000, 'x')));
+    EXPECT_FALSE(accepts(std::string(8000000, 'x')));
     std::string wide;
     for (int count = 0; count < 85; ++count) {
         wide += "\u7c21";

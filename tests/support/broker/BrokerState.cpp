@@ -122,14 +122,15 @@ bool isSlotName(std::string_view name) {
 }
 
 void giveUp(const std::string& reason) {
-    std::fprintf(stderr, "recording broker: %s\n", reason.c_str());
+    (void)std::fprintf(stderr, "recording broker: %s\n", reason.c_str());
     std::abort();
 }
 
 std::string lowerCase(std::string text) {
     for (char& c : text) {
-        if (c >= 'A' && c <= 'Z')
+        if (c >= 'A' && c <= 'Z') {
             c = static_cast<char>(c - 'A' + 'a');
+        }
     }
     return text;
 }
@@ -142,8 +143,9 @@ Object* BrokerState::objectAt(const void* address) {
 }
 
 BrokerState& BrokerState::youngest() {
-    if (world().brokers.empty())
+    if (world().brokers.empty()) {
         giveUp("a slot was called while no broker exists");
+    }
     return *world().brokers.back();
 }
 
@@ -162,8 +164,9 @@ BrokerState::BrokerState() : broker_(*this) {
 
 BrokerState::~BrokerState() {
     const std::lock_guard lock(mutex());
-    for (const auto& object : objects_)
+    for (const auto& object : objects_) {
         world().objects.erase(object->address());
+    }
     world().objects.erase(broker_.address());
     auto& brokers = world().brokers;
     brokers.erase(std::remove(brokers.begin(), brokers.end(), this), brokers.end());
@@ -184,8 +187,9 @@ void BrokerState::beginCall() {
 
 void BrokerState::endCall() {
     for (const auto& object : objects_) {
-        if (object->life == Life::Call)
+        if (object->life == Life::Call) {
             endObject(*object);
+        }
     }
 }
 
@@ -197,8 +201,9 @@ void BrokerState::endObject(Object& object) {
 
 void BrokerState::forgetOldObjects() {
     const auto isOld = [this](const std::unique_ptr<Object>& object) {
-        if (object->life != Life::Ended || object->endedInCall + callsToRemember > callNumber_)
+        if (object->life != Life::Ended || object->endedInCall + callsToRemember > callNumber_) {
             return false;
+        }
         world().objects.erase(object->address());
         return true;
     };
@@ -212,8 +217,9 @@ unsigned BrokerState::liveClones() const {
 }
 
 std::optional<Fault> BrokerState::record(const std::string& slot, const std::string& arguments) {
-    if (!isSlotName(slot))
+    if (!isSlotName(slot)) {
         giveUp("slot '" + slot + "' is missing in the list of slots");
+    }
     record_.lines.push_back(arguments.empty() ? slot : slot + '(' + arguments + ')');
     const unsigned nOfSlot = ++record_.countBySlot[slot];
     const std::optional<Fault> fault =
@@ -230,21 +236,25 @@ std::optional<Fault> BrokerState::record(const std::string& slot, const std::str
 
 std::optional<Fault> BrokerState::faultFor(const std::string& slot, unsigned n,
                                            unsigned nOfSlot) const {
-    if (const auto found = callFaults_.find(n); found != callFaults_.end())
+    if (const auto found = callFaults_.find(n); found != callFaults_.end()) {
         return found->second;
+    }
     const auto ofSlot = slotFaults_.find(slot);
-    if (ofSlot == slotFaults_.end())
+    if (ofSlot == slotFaults_.end()) {
         return std::nullopt;
+    }
     for (const unsigned occurrence : {nOfSlot, 0u}) {
-        if (const auto found = ofSlot->second.find(occurrence); found != ofSlot->second.end())
+        if (const auto found = ofSlot->second.find(occurrence); found != ofSlot->second.end()) {
             return found->second;
+        }
     }
     return std::nullopt;
 }
 
 void BrokerState::failSlot(std::string_view slot, unsigned n, const Fault& how) {
-    if (!isSlotName(slot))
+    if (!isSlotName(slot)) {
         giveUp("there is no slot '" + std::string(slot) + "'");
+    }
     slotFaults_[std::string(slot)][n] = how;
 }
 

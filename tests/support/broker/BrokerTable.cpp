@@ -11,8 +11,9 @@ using PathPtr = const CMPIObjectPath*;
 CMPIContext* prepareAttachThread(Broker mb, Context ctx) {
     Call call("prepareAttachThread", mb);
     call.object(ctx);
-    if (!call.begin())
+    if (!call.begin()) {
         return call.noObject<CMPIContext>();
+    }
     return call.state().make<CMPIContext>(Call::contentOf(ctx));
 }
 
@@ -26,8 +27,9 @@ CMPIStatus attachThread(Broker mb, Context ctx) {
 CMPIStatus detachThread(Broker mb, Context ctx) {
     Call call("detachThread", mb);
     call.object(ctx);
-    if (call.begin())
+    if (call.begin()) {
         BrokerState::endObject(*BrokerState::objectAt(ctx));
+    }
     return call.status();
 }
 
@@ -35,30 +37,37 @@ CMPIStatus detachThread(Broker mb, Context ctx) {
 
 // For an element that a test has made: its content, or a value of the shape it stands for.
 template <typename Cmpi> Value elementValue(const Cmpi* element, CMPIType type) {
-    if (element == nullptr)
+    if (element == nullptr) {
         return Value::missing(type);
+    }
     const Object* const known = BrokerState::objectAt(element);
-    if (known == nullptr || known->kind != Traits<Cmpi>::kind)
+    if (known == nullptr || known->kind != Traits<Cmpi>::kind) {
         giveUp("an answer holds an object that no broker made");
-    if (!known->hasHandle())
+    }
+    if (!known->hasHandle()) {
         return Value::withoutHandle(type);
-    if (known->life == Life::Ended)
+    }
+    if (known->life == Life::Ended) {
         giveUp("an answer holds an object that has ended");
-    if constexpr (std::is_same_v<Cmpi, CMPIObjectPath>)
+    }
+    if constexpr (std::is_same_v<Cmpi, CMPIObjectPath>) {
         return Value::ref(Call::contentOf(element));
-    else
+    } else {
         return Value::embedded(Call::contentOf(element).visible());
+    }
 }
 
 // Removes the properties that were not asked for.
 void applyFilter(Value& value, const char** properties) {
-    if (properties == nullptr || value.instance == nullptr)
+    if (properties == nullptr || value.instance == nullptr) {
         return;
+    }
     InstanceContent content;
     content.data = *value.instance;
     content.filtered = true;
-    for (; *properties != nullptr; ++properties)
+    for (; *properties != nullptr; ++properties) {
         content.filter.emplace_back(*properties);
+    }
     value = Value::embedded(content.visible());
 }
 
@@ -71,14 +80,17 @@ CMPIEnumeration* enumerate(Call& call, const std::map<std::string, Answer<Cmpi>>
     if (found != answers.end()) {
         const Answer<Cmpi>& answer = found->second;
         call.fail(answer.rc, answer.message);
-        if (answer.nullEnumeration)
+        if (answer.nullEnumeration) {
             return nullptr;
-        for (const Cmpi* element : answer.elements)
+        }
+        for (const Cmpi* element : answer.elements) {
             content.elements.push_back(elementValue(element, type));
+        }
     }
     if (!call.state().ignoreFilter) {
-        for (Value& value : content.elements)
+        for (Value& value : content.elements) {
             applyFilter(value, properties);
+        }
     }
     return call.state().make<CMPIEnumeration>(std::move(content));
 }
@@ -87,8 +99,9 @@ CMPIEnumeration* enumerateInstanceNames(Broker mb, Context ctx, PathPtr path, CM
     Call call("enumerateInstanceNames", mb, st);
     call.object(ctx);
     call.object(path);
-    if (!call.begin())
+    if (!call.begin()) {
         return call.noObject<CMPIEnumeration>();
+    }
     return enumerate(call, call.state().nameAnswers, path, nullptr, CMPI_ref);
 }
 
@@ -98,8 +111,9 @@ CMPIEnumeration* enumerateInstances(Broker mb, Context ctx, PathPtr path, const 
     call.object(ctx);
     call.object(path);
     call.list(properties);
-    if (!call.begin())
+    if (!call.begin()) {
         return call.noObject<CMPIEnumeration>();
+    }
     return enumerate(call, call.state().instanceAnswers, path, properties, CMPI_instance);
 }
 
@@ -116,18 +130,21 @@ struct Unsupported : Call {
         object(path);
     }
     template <typename Cmpi> Cmpi* nothing() {
-        if (begin())
+        if (begin()) {
             fail(CMPI_RC_ERR_NOT_SUPPORTED);
+        }
         return noObject<Cmpi>();
     }
     CMPIStatus refusal() {
-        if (begin())
+        if (begin()) {
             fail(CMPI_RC_ERR_NOT_SUPPORTED);
+        }
         return status();
     }
     CMPIData noValue() {
-        if (begin())
+        if (begin()) {
             fail(CMPI_RC_ERR_NOT_SUPPORTED);
+        }
         return noData();
     }
 };
@@ -177,8 +194,9 @@ CMPIEnumeration* associators(Broker mb, Context ctx, PathPtr path, const char* a
                              const char* resultClass, const char* role, const char* resultRole,
                              const char** properties, CMPIStatus* st) {
     Unsupported call("associators", mb, ctx, path, st);
-    for (const char* filter : {assocClass, resultClass, role, resultRole})
+    for (const char* filter : {assocClass, resultClass, role, resultRole}) {
         call.optional(filter);
+    }
     call.list(properties);
     return call.nothing<CMPIEnumeration>();
 }
@@ -187,8 +205,9 @@ CMPIEnumeration* associatorNames(Broker mb, Context ctx, PathPtr path, const cha
                                  const char* resultClass, const char* role, const char* resultRole,
                                  CMPIStatus* st) {
     Unsupported call("associatorNames", mb, ctx, path, st);
-    for (const char* filter : {assocClass, resultClass, role, resultRole})
+    for (const char* filter : {assocClass, resultClass, role, resultRole}) {
         call.optional(filter);
+    }
     return call.nothing<CMPIEnumeration>();
 }
 

@@ -11,8 +11,9 @@ std::string describeObject(const Object& object) {
         const Path& path = *static_cast<const ObjectOf<CMPIObjectPath>&>(object).content;
         return path.nameSpace + ':' + path.className;
     }
-    if (object.kind == Kind::String)
+    if (object.kind == Kind::String) {
         return '"' + *static_cast<const ObjectOf<CMPIString>&>(object).content + '"';
+    }
     return {};
 }
 
@@ -27,44 +28,49 @@ Call::Call(const char* slot, const void* self, Kind kind, CMPIStatus* st)
 }
 
 Call::~Call() {
-    if (st_ != nullptr)
+    if (st_ != nullptr) {
         write(rc_, message_);
+    }
 }
 
 Object* Call::check(const void* object, Kind kind, const char* role) {
     const std::string what = std::string(kindName(kind)) + " as " + role;
     Object* const known = BrokerState::objectAt(object);
-    if (object == nullptr)
+    if (object == nullptr) {
         refuse(CMPI_RC_ERR_INVALID_HANDLE, "NULL " + what);
-    else if (known == nullptr)
+    } else if (known == nullptr) {
         refuse(CMPI_RC_ERR_INVALID_HANDLE, "unknown " + what);
-    else if (known->kind != kind)
+    } else if (known->kind != kind) {
         refuse(CMPI_RC_ERR_INVALID_HANDLE, std::string(kindName(known->kind)) + " for " + what);
-    else if (known->life == Life::Ended)
+    } else if (known->life == Life::Ended) {
         refuse(CMPI_RC_ERR_INVALID_HANDLE, what + " used after its end");
-    else if (!known->hasHandle())
+    } else if (!known->hasHandle()) {
         refuse(CMPI_RC_ERR_INVALID_HANDLE, what + " without a handle");
-    else
+    } else {
         return known;
+    }
     return nullptr;
 }
 
 void Call::argument(const std::string& text) {
-    if (hasArguments_)
+    if (hasArguments_) {
         arguments_ += ',';
+    }
     arguments_ += text;
     hasArguments_ = true;
 }
 
 void Call::text(const char* text) {
-    if (text == nullptr)
+    if (text == nullptr) {
         refuse(CMPI_RC_ERR_INVALID_PARAMETER, "NULL text");
+    }
     optional(text);
 }
 
 void Call::quoted(const char* text) {
-    if (text == nullptr)
+    if (text == nullptr) {
         refuse(CMPI_RC_ERR_INVALID_PARAMETER, "NULL text");
+    }
     argument(text == nullptr ? "null" : '"' + std::string(text) + '"');
 }
 
@@ -76,8 +82,9 @@ void Call::list(const char** names) {
         return;
     }
     std::string text;
-    for (; *names != nullptr; ++names)
+    for (; *names != nullptr; ++names) {
         text += (text.empty() ? "" : ",") + std::string(*names);
+    }
     argument('{' + text + '}');
 }
 
@@ -85,15 +92,17 @@ void Call::number(unsigned long long number) { argument(std::to_string(number));
 
 void Call::elementType(CMPIType type) {
     argument(typeName(type));
-    if (!isKnownType(type) || (type & CMPI_ARRAY) != 0)
+    if (!isKnownType(type) || (type & CMPI_ARRAY) != 0) {
         refuse(CMPI_RC_ERR_INVALID_DATA_TYPE, "unknown type " + typeName(type));
+    }
 }
 
 void Call::object(const void* object, Kind kind) {
     const Object* const known = check(object, kind, "argument");
     const std::string text = known == nullptr ? "invalid" : describeObject(*known);
-    if (!text.empty())
+    if (!text.empty()) {
         argument(text);
+    }
 }
 
 Value Call::value(const CMPIValue* value, CMPIType type) {
@@ -104,8 +113,9 @@ Value Call::value(const CMPIValue* value, CMPIType type) {
 
 bool Call::begin() {
     const std::optional<Fault> fault = state_->record(slot_, arguments_);
-    if (fault)
+    if (fault) {
         meet(*fault);
+    }
     return !faulted_ && rc_ == CMPI_RC_OK;
 }
 
@@ -125,16 +135,19 @@ void Call::fail(CMPIrc rc, const std::string& message) {
 
 void Call::refuse(CMPIrc rc, const std::string& text) {
     violate(text);
-    if (rc_ == CMPI_RC_OK)
+    if (rc_ == CMPI_RC_OK) {
         fail(rc);
+    }
 }
 
 CMPIStatus Call::status() {
     CMPIStatus result = {rc_, nullptr};
-    if (faulted_ && rc_ == CMPI_RC_OK)
+    if (faulted_ && rc_ == CMPI_RC_OK) {
         result.rc = CMPI_RC_ERR_FAILED;
-    if (!message_.empty())
+    }
+    if (!message_.empty()) {
         result.msg = string(message_);
+    }
     return result;
 }
 
@@ -144,15 +157,17 @@ void Call::write(CMPIrc rc, const std::string& message) {
 }
 
 CMPIData Call::noData(CMPIType type) {
-    if (nullHandleWanted_)
+    if (nullHandleWanted_) {
         return data(Value::withoutHandle(type));
+    }
     CMPIData result = {type, CMPI_nullValue | CMPI_notFound, {0}};
     return result;
 }
 
 CMPIData Call::noDataAndName(CMPIString** name) {
-    if (name != nullptr)
+    if (name != nullptr) {
         *name = noObject<CMPIString>();
+    }
     return noData();
 }
 
@@ -165,8 +180,9 @@ CMPIData Call::data(const Value& value, CMPIValueState extraState) {
 CMPIData Call::named(const std::vector<NamedValue>& values, const char* name,
                      CMPIValueState extraState) {
     const Value* const found = find(values, name);
-    if (found != nullptr)
+    if (found != nullptr) {
         return data(*found, extraState);
+    }
     fail(CMPI_RC_ERR_NO_SUCH_PROPERTY);
     return noData();
 }
@@ -177,8 +193,9 @@ CMPIData Call::at(const std::vector<NamedValue>& values, CMPICount index, CMPISt
         refuse(CMPI_RC_ERR_NO_SUCH_PROPERTY, "position out of range");
         return noDataAndName(name);
     }
-    if (name != nullptr)
+    if (name != nullptr) {
         *name = string(values[index].name);
+    }
     return data(values[index].value, extraState);
 }
 

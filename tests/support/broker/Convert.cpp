@@ -55,8 +55,9 @@ bool holds(CMPIType arrayElements, CMPIType declared) {
 
 Value arrayFromCmpi(Call& call, const CMPIValue* value, CMPIType type) {
     const auto* const array = call.checked(load<const CMPIArray*>(value));
-    if (array == nullptr)
+    if (array == nullptr) {
         return Value::nullOf(type);
+    }
     const CMPIType elements = array->content->elementType;
     if (!holds(elements, simpleType(type))) {
         call.refuse(CMPI_RC_ERR_TYPE_MISMATCH,
@@ -68,14 +69,17 @@ Value arrayFromCmpi(Call& call, const CMPIValue* value, CMPIType type) {
 
 Value objectFromCmpi(Call& call, const CMPIValue* value, CMPIType type) {
     if (type == CMPI_string) {
-        if (const auto* string = call.checked(load<const CMPIString*>(value)))
+        if (const auto* string = call.checked(load<const CMPIString*>(value))) {
             return Value::string(*string->content);
+        }
     } else if (type == CMPI_dateTime) {
-        if (const auto* date = call.checked(load<const CMPIDateTime*>(value)))
+        if (const auto* date = call.checked(load<const CMPIDateTime*>(value))) {
             return Value::dateTime(date->content->text);
+        }
     } else if (type == CMPI_ref) {
-        if (const auto* path = call.checked(load<const CMPIObjectPath*>(value)))
+        if (const auto* path = call.checked(load<const CMPIObjectPath*>(value))) {
             return Value::ref(*path->content);
+        }
     } else if (const auto* instance = call.checked(load<const CMPIInstance*>(value))) {
         return Value::embedded(instance->content->visible());
     }
@@ -85,10 +89,12 @@ Value objectFromCmpi(Call& call, const CMPIValue* value, CMPIType type) {
 // A new object with that content, or what the value's shape asks for instead.
 template <typename Cmpi, typename Content>
 Cmpi* objectFor(BrokerState& state, const Value& value, Content&& content) {
-    if (value.shape == Value::Shape::Missing)
+    if (value.shape == Value::Shape::Missing) {
         return nullptr;
-    if (value.shape == Value::Shape::WithoutHandle)
+    }
+    if (value.shape == Value::Shape::WithoutHandle) {
         return state.makeWithoutHandle<Cmpi>();
+    }
     return state.make<Cmpi>(std::forward<Content>(content));
 }
 
@@ -105,8 +111,9 @@ void objectToCmpi(BrokerState& state, const Value& value, CMPIData& data) {
         return;
     default: {
         InstanceContent content;
-        if (value.instance)
+        if (value.instance) {
             content.data = *value.instance;
+        }
         data.value.inst = objectFor<CMPIInstance>(state, value, std::move(content));
         return;
     }
@@ -114,8 +121,9 @@ void objectToCmpi(BrokerState& state, const Value& value, CMPIData& data) {
 }
 
 CMPIType typeForReader(CMPIType type) {
-    if (simpleType(type) != CMPI_chars)
+    if (simpleType(type) != CMPI_chars) {
         return type;
+    }
     return static_cast<CMPIType>(CMPI_string | (type & CMPI_ARRAY));
 }
 
@@ -151,14 +159,18 @@ Value fromCmpi(Call& call, const CMPIValue* value, CMPIType type) {
         call.refuse(CMPI_RC_ERR_INVALID_DATA_TYPE, "unknown type " + typeName(type));
         return Value::nullOf(type);
     }
-    if (value == nullptr)
+    if (value == nullptr) {
         return Value::nullOf(type);
-    if ((type & CMPI_ARRAY) != 0)
+    }
+    if ((type & CMPI_ARRAY) != 0) {
         return arrayFromCmpi(call, value, type);
-    if (type == CMPI_chars)
+    }
+    if (type == CMPI_chars) {
         return Value::chars(reinterpret_cast<const char*>(value));
-    if ((type & CMPI_ENC) != 0)
+    }
+    if ((type & CMPI_ENC) != 0) {
         return objectFromCmpi(call, value, type);
+    }
     return scalarFromCmpi(value, type);
 }
 

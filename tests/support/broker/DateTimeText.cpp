@@ -17,11 +17,13 @@ bool isAsterisk(char c) { return c == '*'; }
 
 // A field of asterisks is the least value, an asterisk after digits a 0.
 unsigned number(const std::string& text, std::size_t at, std::size_t count, unsigned least = 0) {
-    if (isAsterisk(text[at]))
+    if (isAsterisk(text[at])) {
         return least;
+    }
     unsigned value = 0;
-    for (std::size_t i = at; i < at + count; ++i)
+    for (std::size_t i = at; i < at + count; ++i) {
         value = value * 10 + (isAsterisk(text[i]) ? 0 : static_cast<unsigned>(text[i] - '0'));
+    }
     return value;
 }
 
@@ -29,10 +31,12 @@ bool isField(const std::string& text, std::size_t at, std::size_t count, unsigne
              unsigned most) {
     const auto begin = text.begin() + static_cast<std::ptrdiff_t>(at);
     const auto end = begin + static_cast<std::ptrdiff_t>(count);
-    if (std::all_of(begin, end, isAsterisk))
+    if (std::all_of(begin, end, isAsterisk)) {
         return true;
-    if (!std::all_of(begin, end, isDigit))
+    }
+    if (!std::all_of(begin, end, isDigit)) {
         return false;
+    }
     const unsigned value = number(text, at, count);
     return value >= least && value <= most;
 }
@@ -51,8 +55,9 @@ bool isTimeOfDay(const std::string& text) {
 bool isDate(const std::string& text) {
     static constexpr std::array<unsigned, 12> days = {31, 29, 31, 30, 31, 30,
                                                       31, 31, 30, 31, 30, 31};
-    if (!isField(text, 0, 4, 0, 9999) || !isField(text, 4, 2, 1, 12))
+    if (!isField(text, 0, 4, 0, 9999) || !isField(text, 4, 2, 1, 12)) {
         return false;
+    }
     return isField(text, 6, 2, 1, days[number(text, 4, 2, 1) - 1]);
 }
 
@@ -72,10 +77,12 @@ std::int64_t daysSinceEpoch(int year, int month, int day) {
 bool isIntervalText(const std::string& text) { return text.size() == length && text[21] == ':'; }
 
 bool isDateTimeText(const std::string& text) {
-    if (text.size() != length || !isTimeOfDay(text))
+    if (text.size() != length || !isTimeOfDay(text)) {
         return false;
-    if (isIntervalText(text))
+    }
+    if (isIntervalText(text)) {
         return isField(text, 0, 8, 0, 99999999) && text.compare(22, 3, "000") == 0;
+    }
     return (text[21] == '+' || text[21] == '-') && isDate(text) && isField(text, 22, 3, 0, 999);
 }
 

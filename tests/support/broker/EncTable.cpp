@@ -11,8 +11,9 @@ namespace {
 CMPIInstance* newInstance(const CMPIBroker* mb, const CMPIObjectPath* path, CMPIStatus* st) {
     Call call("newInstance", mb, st);
     call.object(path);
-    if (!call.begin())
+    if (!call.begin()) {
         return call.noObject<CMPIInstance>();
+    }
     InstanceContent content;
     content.data.path = Call::contentOf(path);
     return call.state().make<CMPIInstance>(std::move(content));
@@ -23,8 +24,9 @@ CMPIObjectPath* newObjectPath(const CMPIBroker* mb, const char* ns, const char* 
     Call call("newObjectPath", mb, st);
     call.text(ns);
     call.text(className);
-    if (!call.begin())
+    if (!call.begin()) {
         return call.noObject<CMPIObjectPath>();
+    }
     return call.state().make<CMPIObjectPath>({"", ns, className, {}});
 }
 
@@ -43,15 +45,17 @@ CMPIArray* newArray(const CMPIBroker* mb, CMPICount size, CMPIType type, CMPISta
     Call call("newArray", mb, st);
     call.number(size);
     call.elementType(type);
-    if (!call.begin())
+    if (!call.begin()) {
         return call.noObject<CMPIArray>();
+    }
     return call.state().make<CMPIArray>({type, std::vector<Value>(size, Value::nullOf(type))});
 }
 
 CMPIDateTime* newDateTime(const CMPIBroker* mb, CMPIStatus* st) {
     Call call("newDateTime", mb, st);
-    if (!call.begin())
+    if (!call.begin()) {
         return call.noObject<CMPIDateTime>();
+    }
     const auto now = static_cast<std::uint64_t>(std::time(nullptr));
     return call.state().make<CMPIDateTime>({dateTimeTextOf(now * 1000000, false)});
 }
@@ -61,18 +65,21 @@ CMPIDateTime* newDateTimeFromBinary(const CMPIBroker* mb, CMPIUint64 time, CMPIB
     Call call("newDateTimeFromBinary", mb, st);
     call.number(time);
     call.number(interval);
-    if (!call.begin())
+    if (!call.begin()) {
         return call.noObject<CMPIDateTime>();
+    }
     return call.state().make<CMPIDateTime>({dateTimeTextOf(time, interval != 0)});
 }
 
 CMPIDateTime* newDateTimeFromChars(const CMPIBroker* mb, const char* text, CMPIStatus* st) {
     Call call("newDateTimeFromChars", mb, st);
     call.quoted(text);
-    if (!call.begin())
+    if (!call.begin()) {
         return call.noObject<CMPIDateTime>();
-    if (isDateTimeText(text))
+    }
+    if (isDateTimeText(text)) {
         return call.state().make<CMPIDateTime>({text});
+    }
     call.fail(CMPI_RC_ERR_INVALID_PARAMETER);
     return nullptr;
 }
@@ -82,10 +89,12 @@ CMPISelectExp* newSelectExp(const CMPIBroker* mb, const char* query, const char*
     Call call("newSelectExp", mb, st);
     call.text(query);
     call.text(lang);
-    if (projection != nullptr)
+    if (projection != nullptr) {
         *projection = nullptr;
-    if (call.begin())
+    }
+    if (call.begin()) {
         call.fail(CMPI_RC_ERR_NOT_SUPPORTED);
+    }
     return nullptr;
 }
 
@@ -94,16 +103,18 @@ CMPIBoolean classPathIsA(const CMPIBroker* mb, const CMPIObjectPath* path, const
     Call call("classPathIsA", mb, st);
     call.object(path);
     call.text(className);
-    if (!call.begin())
+    if (!call.begin()) {
         return 0;
+    }
     return strcasecmp(Call::contentOf(path).className.c_str(), className) == 0 ? 1 : 0;
 }
 
 // Any live object; NULL when it is none, which is a violation.
 Object* anyObject(Call& call, const void* object) {
     Object* const known = BrokerState::objectAt(object);
-    if (known != nullptr && known->life != Life::Ended && known->hasHandle())
+    if (known != nullptr && known->life != Life::Ended && known->hasHandle()) {
         return known;
+    }
     call.refuse(CMPI_RC_ERR_INVALID_HANDLE, "no live object as argument");
     return nullptr;
 }
@@ -111,13 +122,16 @@ Object* anyObject(Call& call, const void* object) {
 CMPIString* toString(const CMPIBroker* mb, const void* object, CMPIStatus* st) {
     Call call("broker.toString", mb, st);
     const Object* const known = anyObject(call, object);
-    if (!call.begin())
+    if (!call.begin()) {
         return call.noObject<CMPIString>();
-    if (known->kind == Kind::ObjectPath)
+    }
+    if (known->kind == Kind::ObjectPath) {
         return call.string(Call::contentOf(static_cast<const CMPIObjectPath*>(object)).toString());
-    if (known->kind == Kind::Instance)
+    }
+    if (known->kind == Kind::Instance) {
         return call.string(
             Call::contentOf(static_cast<const CMPIInstance*>(object)).visible().toString());
+    }
     return call.string(kindName(known->kind));
 }
 
@@ -125,8 +139,9 @@ CMPIBoolean isOfType(const CMPIBroker* mb, const void* object, const char* type,
     Call call("isOfType", mb, st);
     const Object* const known = anyObject(call, object);
     call.text(type);
-    if (!call.begin())
+    if (!call.begin()) {
         return 0;
+    }
     return std::string_view(kindName(known->kind)) == type ? 1 : 0;
 }
 
@@ -138,8 +153,9 @@ CMPIString* getType(const CMPIBroker* mb, const void* object, CMPIStatus* st) {
 
 // The default text as it is.
 CMPIString* untranslated(Call& call, const char* text) {
-    if (!call.begin())
+    if (!call.begin()) {
         return call.noObject<CMPIString>();
+    }
     call.fail(CMPI_RC_ERR_NOT_SUPPORTED);
     return call.string(text);
 }
@@ -165,16 +181,19 @@ CMPIStatus write(Call& call, std::vector<BrokerTrace> CallRecord::*list, int lev
                  const char* component, const char* text, const CMPIString* string) {
     call.number(static_cast<unsigned>(level));
     call.optional(component);
-    if (text != nullptr || string == nullptr)
+    if (text != nullptr || string == nullptr) {
         call.text(text);
-    else
+    } else {
         call.object(string);
-    if (!call.begin())
+    }
+    if (!call.begin()) {
         return call.status();
+    }
     const std::string line = text != nullptr ? text : Call::contentOf(string);
     (call.state().current().*list).push_back({level, component == nullptr ? "" : component, line});
-    if (call.state().refuseTraces)
+    if (call.state().refuseTraces) {
         call.fail(CMPI_RC_ERR_NOT_SUPPORTED);
+    }
     return call.status();
 }
 
@@ -197,27 +216,31 @@ CMPIError* newCMPIError(const CMPIBroker* mb, const char* owner, const char* msg
     call.optional(owner);
     call.optional(msgID);
     call.optional(msg);
-    if (call.begin())
+    if (call.begin()) {
         call.fail(CMPI_RC_ERR_NOT_SUPPORTED);
+    }
     return nullptr;
 }
 
 CMPIStatus openMessageFile(const CMPIBroker* mb, const char* file, CMPIMsgFileHandle* handle) {
     Call call("openMessageFile", mb);
     call.text(file);
-    if (handle == nullptr)
+    if (handle == nullptr) {
         call.refuse(CMPI_RC_ERR_INVALID_PARAMETER, "NULL handle");
-    else
+    } else {
         *handle = nullptr;
-    if (call.begin())
+    }
+    if (call.begin()) {
         call.fail(CMPI_RC_ERR_NOT_FOUND);
+    }
     return call.status();
 }
 
 CMPIStatus closeMessageFile(const CMPIBroker* mb, const CMPIMsgFileHandle handle) {
     Call call("closeMessageFile", mb);
-    if (handle != nullptr)
+    if (handle != nullptr) {
         call.refuse(CMPI_RC_ERR_INVALID_HANDLE, "unknown message file");
+    }
     call.begin();
     return call.status();
 }

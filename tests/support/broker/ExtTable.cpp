@@ -20,8 +20,9 @@ namespace {
 char* resolveFileName(const char* name) {
     static std::mutex mutex;
     static std::set<std::string> names;
-    if (name == nullptr)
+    if (name == nullptr) {
         return nullptr;
+    }
     const std::lock_guard lock(mutex);
     return const_cast<char*>(names.insert("lib" + std::string(name) + ".so").first->c_str());
 }
@@ -32,16 +33,18 @@ struct Thread {
 
 void* newThread(void* (*start)(void*), void* parm, int detached) {
     auto* const thread = new (std::nothrow) Thread();
-    if (thread == nullptr)
+    if (thread == nullptr) {
         return nullptr;
+    }
     pthread_attr_t attributes;
     pthread_attr_init(&attributes);
     pthread_attr_setdetachstate(&attributes,
                                 detached != 0 ? PTHREAD_CREATE_DETACHED : PTHREAD_CREATE_JOINABLE);
     const int error = pthread_create(&thread->id, &attributes, start, parm);
     pthread_attr_destroy(&attributes);
-    if (error == 0)
+    if (error == 0) {
         return thread;
+    }
     delete thread;
     return nullptr;
 }
@@ -49,8 +52,9 @@ void* newThread(void* (*start)(void*), void* parm, int detached) {
 int joinThread(void* thread, void** code) {
     auto* const joined = static_cast<Thread*>(thread);
     const int error = pthread_join(joined->id, code);
-    if (error == 0)
+    if (error == 0) {
         delete joined;
+    }
     return error;
 }
 
@@ -79,8 +83,9 @@ int setThreadSpecific(CMPI_THREAD_KEY_TYPE key, void* value) {
 
 void* newMutex(int) {
     auto* const mutex = new (std::nothrow) pthread_mutex_t;
-    if (mutex == nullptr)
+    if (mutex == nullptr) {
         return nullptr;
+    }
     pthread_mutexattr_t attributes;
     pthread_mutexattr_init(&attributes);
     pthread_mutexattr_settype(&attributes, PTHREAD_MUTEX_RECURSIVE);
@@ -98,8 +103,9 @@ void unlockMutex(void* mutex) { pthread_mutex_unlock(asMutex(mutex)); }
 
 void* newCondition(int) {
     auto* const condition = new (std::nothrow) pthread_cond_t;
-    if (condition != nullptr)
+    if (condition != nullptr) {
         pthread_cond_init(condition, nullptr);
+    }
     return condition;
 }
 pthread_cond_t* asCondition(void* condition) { return static_cast<pthread_cond_t*>(condition); }

@@ -71,8 +71,9 @@ TEST_F(FaultTest, Counting_begins_anew_with_each_call_of_the_provider) {
 
 TEST_F(FaultTest, A_null_fault_gives_empty_results_and_an_innocent_status) {
     for (const char* slot : {"newInstance", "getNameSpace", "getKey", "getKeyCount", "getCharPtr",
-                             "isOfType", "setHostname", "getKeyAt"})
+                             "isOfType", "setHostname", "getKeyAt"}) {
         broker_.failSlot(slot, 0, Fault::null());
+    }
     EXPECT_EQ(CMNewInstance(mb_, path_, &status_), nullptr);
     expectStatus(CMPI_RC_OK);
     EXPECT_EQ(CMGetNameSpace(path_, &status_), nullptr);
@@ -97,8 +98,9 @@ TEST_F(FaultTest, A_null_fault_gives_empty_results_and_an_innocent_status) {
 
 TEST_F(FaultTest, An_error_fault_gives_empty_results_and_its_status) {
     const Fault fault = Fault::error(CMPI_RC_ERR_ACCESS_DENIED, "no");
-    for (const char* slot : {"newInstance", "getKey", "getKeyCount", "setHostname"})
+    for (const char* slot : {"newInstance", "getKey", "getKeyCount", "setHostname"}) {
         broker_.failSlot(slot, 0, fault);
+    }
     EXPECT_EQ(CMNewInstance(mb_, path_, &status_), nullptr);
     expectStatus(CMPI_RC_ERR_ACCESS_DENIED, "no");
     EXPECT_TRUE(CMIsNullValue(CMGetKey(path_, "Name", &status_)));
@@ -112,8 +114,9 @@ TEST_F(FaultTest, An_error_fault_gives_empty_results_and_its_status) {
 TEST_F(FaultTest, A_null_handle_fault_gives_objects_without_handle) {
     for (const char* slot :
          {"newInstance", "newString", "newObjectPath", "newArray", "newDateTimeFromChars", "getKey",
-          "getKeyAt", "setHostname", "enumerateInstanceNames", "clone"})
+          "getKeyAt", "setHostname", "enumerateInstanceNames", "clone"}) {
         broker_.failSlot(slot, 0, Fault::nullHandle());
+    }
     const auto isHollow = [](const auto* object) {
         return object != nullptr && object->hdl == nullptr && object->ft != nullptr;
     };
@@ -174,8 +177,9 @@ TEST(FaultSweep, A_sweep_ends_when_there_are_fewer_calls_than_n) {
         broker.run([&](const CMPIContext* ctx, const CMPIResult* rslt) {
             return mi->ft->enumerateInstances(mi, ctx, rslt, path, nullptr);
         });
-        if (!broker.faultHit())
+        if (!broker.faultHit()) {
             break;
+        }
         ++sweeps;
         withViolations += broker.violations().empty() ? 0 : 1;
     }

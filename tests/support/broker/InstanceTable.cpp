@@ -7,8 +7,9 @@ namespace {
 CMPIData getProperty(const CMPIInstance* self, const char* name, CMPIStatus* st) {
     Call call("getProperty", self, st);
     call.text(name);
-    if (!call.begin())
+    if (!call.begin()) {
         return call.noData();
+    }
     return call.named(call.content<CMPIInstance>().visible().properties, name);
 }
 
@@ -16,22 +17,25 @@ CMPIData getPropertyAt(const CMPIInstance* self, CMPICount index, CMPIString** n
                        CMPIStatus* st) {
     Call call("getPropertyAt", self, st);
     call.number(index);
-    if (!call.begin())
+    if (!call.begin()) {
         return call.noDataAndName(name);
+    }
     return call.at(call.content<CMPIInstance>().visible().properties, index, name);
 }
 
 CMPICount getPropertyCount(const CMPIInstance* self, CMPIStatus* st) {
     Call call("getPropertyCount", self, st);
-    if (!call.begin())
+    if (!call.begin()) {
         return 0;
+    }
     return static_cast<CMPICount>(call.content<CMPIInstance>().visible().properties.size());
 }
 
 void store(Call& call, const char* name, const Value& value) {
     InstanceContent& instance = call.content<CMPIInstance>();
-    if (instance.admits(name))
+    if (instance.admits(name)) {
         put(instance.data.properties, name, value);
+    }
 }
 
 CMPIStatus setProperty(const CMPIInstance* self, const char* name, const CMPIValue* value,
@@ -39,8 +43,9 @@ CMPIStatus setProperty(const CMPIInstance* self, const char* name, const CMPIVal
     Call call("setProperty", self);
     call.text(name);
     const Value property = call.value(value, type);
-    if (call.begin())
+    if (call.begin()) {
         store(call, name, property);
+    }
     return call.status();
 }
 
@@ -50,15 +55,17 @@ CMPIStatus setPropertyWithOrigin(const CMPIInstance* self, const char* name, con
     call.text(name);
     const Value property = call.value(value, type);
     call.optional(origin);
-    if (call.begin())
+    if (call.begin()) {
         store(call, name, property);
+    }
     return call.status();
 }
 
 CMPIObjectPath* getObjectPath(const CMPIInstance* self, CMPIStatus* st) {
     Call call("getObjectPath", self, st);
-    if (!call.begin())
+    if (!call.begin()) {
         return call.noObject<CMPIObjectPath>();
+    }
     return call.state().make<CMPIObjectPath>(call.content<CMPIInstance>().data.path);
 }
 
@@ -66,21 +73,24 @@ CMPIStatus setPropertyFilter(const CMPIInstance* self, const char** properties, 
     Call call("setPropertyFilter", self);
     call.list(properties);
     call.list(keys);
-    if (!call.begin() || call.state().ignoreFilter)
+    if (!call.begin() || call.state().ignoreFilter) {
         return call.status();
+    }
     InstanceContent& instance = call.content<CMPIInstance>();
     instance.filtered = properties != nullptr;
     instance.filter.clear();
-    for (; properties != nullptr && *properties != nullptr; ++properties)
+    for (; properties != nullptr && *properties != nullptr; ++properties) {
         instance.filter.emplace_back(*properties);
+    }
     return call.status();
 }
 
 CMPIStatus setObjectPath(const CMPIInstance* self, const CMPIObjectPath* path) {
     Call call("setObjectPath", self);
     call.object(path);
-    if (call.begin())
+    if (call.begin()) {
         call.content<CMPIInstance>().data.path = Call::contentOf(path);
+    }
     return call.status();
 }
 

@@ -8,16 +8,18 @@ CMPIStatus setText(const char* slot, const CMPIObjectPath* self, std::string Pat
                    const char* text) {
     Call call(slot, self);
     call.text(text);
-    if (call.begin())
+    if (call.begin()) {
         call.content<CMPIObjectPath>().*member = text;
+    }
     return call.status();
 }
 
 CMPIString* getText(const char* slot, const CMPIObjectPath* self, std::string Path::*member,
                     CMPIStatus* st) {
     Call call(slot, self, st);
-    if (!call.begin())
+    if (!call.begin()) {
         return call.noObject<CMPIString>();
+    }
     return call.string(call.content<CMPIObjectPath>().*member);
 }
 
@@ -46,36 +48,42 @@ CMPIStatus addKey(const CMPIObjectPath* self, const char* name, const CMPIValue*
                   CMPIType type) {
     Call call("addKey", self);
     call.text(name);
-    if (!isKeyType(type))
+    if (!isKeyType(type)) {
         call.refuse(CMPI_RC_ERR_INVALID_DATA_TYPE, typeName(type) + " as key");
-    if (value == nullptr)
+    }
+    if (value == nullptr) {
         call.refuse(CMPI_RC_ERR_INVALID_PARAMETER, "NULL as key");
+    }
     const Value key = call.value(value, type);
-    if (call.begin())
+    if (call.begin()) {
         put(call.content<CMPIObjectPath>().keys, name, key);
+    }
     return call.status();
 }
 
 CMPIData getKey(const CMPIObjectPath* self, const char* name, CMPIStatus* st) {
     Call call("getKey", self, st);
     call.text(name);
-    if (!call.begin())
+    if (!call.begin()) {
         return call.noData();
+    }
     return call.named(call.content<CMPIObjectPath>().keys, name, CMPI_keyValue);
 }
 
 CMPIData getKeyAt(const CMPIObjectPath* self, CMPICount index, CMPIString** name, CMPIStatus* st) {
     Call call("getKeyAt", self, st);
     call.number(index);
-    if (!call.begin())
+    if (!call.begin()) {
         return call.noDataAndName(name);
+    }
     return call.at(call.content<CMPIObjectPath>().keys, index, name, CMPI_keyValue);
 }
 
 CMPICount getKeyCount(const CMPIObjectPath* self, CMPIStatus* st) {
     Call call("getKeyCount", self, st);
-    if (!call.begin())
+    if (!call.begin()) {
         return 0;
+    }
     return static_cast<CMPICount>(call.content<CMPIObjectPath>().keys.size());
 }
 
@@ -102,8 +110,9 @@ CMPIStatus setHostAndNameSpaceFromObjectPath(const CMPIObjectPath* self,
 }
 
 CMPIData noQualifier(Call& call) {
-    if (call.begin())
+    if (call.begin()) {
         call.fail(CMPI_RC_ERR_NOT_SUPPORTED);
+    }
     return call.noData();
 }
 
@@ -140,8 +149,9 @@ CMPIData getParameterQualifier(const CMPIObjectPath* self, const char* method,
 
 CMPIString* toString(const CMPIObjectPath* self, CMPIStatus* st) {
     Call call("toString", self, st);
-    if (!call.begin())
+    if (!call.begin()) {
         return call.noObject<CMPIString>();
+    }
     return call.string(call.content<CMPIObjectPath>().toString());
 }
 

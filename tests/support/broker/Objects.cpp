@@ -43,8 +43,9 @@ Instance InstanceContent::visible() const {
     Instance result;
     result.path = data.path;
     for (const NamedValue& entry : data.properties) {
-        if (admits(entry.name))
+        if (admits(entry.name)) {
             result.properties.push_back(entry);
+        }
     }
     return result;
 }
@@ -69,8 +70,9 @@ void put(std::vector<NamedValue>& values, const std::string& name, const Value& 
 
 const Value* find(const std::vector<NamedValue>& values, const std::string& name) {
     for (const NamedValue& entry : values) {
-        if (strcasecmp(entry.name.c_str(), name.c_str()) == 0)
+        if (strcasecmp(entry.name.c_str(), name.c_str()) == 0) {
             return &entry.value;
+        }
     }
     return nullptr;
 }

@@ -31,22 +31,25 @@ bool sameName(const std::string& a, const std::string& b) {
 
 const Value* findByName(const std::vector<NamedValue>& values, const std::string& name) {
     for (const NamedValue& entry : values) {
-        if (sameName(entry.name, name))
+        if (sameName(entry.name, name)) {
             return &entry.value;
+        }
     }
     return nullptr;
 }
 
 std::string textOf(const Value* value) {
-    if (value == nullptr)
+    if (value == nullptr) {
         return "<none>";
+    }
     return value->isNull ? "<null>" : value->text;
 }
 
 std::vector<std::string> namesOf(const std::vector<NamedValue>& values) {
     std::vector<std::string> names;
-    for (const NamedValue& entry : values)
+    for (const NamedValue& entry : values) {
         names.push_back(entry.name);
+    }
     return names;
 }
 
@@ -80,19 +83,25 @@ bool isText(CMPIType type) {
 
 // The value without its type.
 std::string valueText(const Value& value) {
-    if (value.shape == Value::Shape::Missing)
+    if (value.shape == Value::Shape::Missing) {
         return "missing";
-    if (value.shape == Value::Shape::WithoutHandle)
+    }
+    if (value.shape == Value::Shape::WithoutHandle) {
         return "without handle";
-    if (value.isNull)
+    }
+    if (value.isNull) {
         return "null";
-    if (isText(value.type))
+    }
+    if (isText(value.type)) {
         return '"' + value.text + '"';
-    if ((value.type & CMPI_ARRAY) == 0)
+    }
+    if ((value.type & CMPI_ARRAY) == 0) {
         return value.text;
+    }
     std::string text;
-    for (const Value& element : value.elements)
+    for (const Value& element : value.elements) {
         text += (text.empty() ? "" : ",") + valueText(element);
+    }
     return '{' + text + '}';
 }
 
@@ -174,8 +183,9 @@ Value Value::array(CMPIType elementType, const std::vector<Value>& elements) {
     value.type = static_cast<CMPIType>(elementType | CMPI_ARRAY);
     value.isNull = false;
     value.elements = elements;
-    for (const Value& element : elements)
+    for (const Value& element : elements) {
         value.text += (value.text.empty() ? "" : ",") + (element.isNull ? "null" : element.text);
+    }
     value.text = '{' + value.text + '}';
     return value;
 }
@@ -205,16 +215,18 @@ std::vector<std::string> Instance::propertyNames() const { return namesOf(proper
 
 std::string Instance::toString() const {
     std::string text = path.toString() + '\n';
-    for (const NamedValue& entry : properties)
+    for (const NamedValue& entry : properties) {
         text += entry.name + '=' + entry.value.describe() + '\n';
+    }
     return text;
 }
 
 std::string typeName(CMPIType type) {
     const CMPIType simple = static_cast<CMPIType>(type & ~CMPI_ARRAY);
     for (const TypeName& entry : typeNames) {
-        if (entry.type == simple)
+        if (entry.type == simple) {
             return entry.name + std::string((type & CMPI_ARRAY) != 0 ? "[]" : "");
+        }
     }
     std::array<char, 8> digits{};
     const auto end = std::to_chars(digits.data(), digits.data() + digits.size(), type, 16);

@@ -13,10 +13,12 @@ using Lock = std::lock_guard<std::recursive_mutex>;
 // The content of a live object.
 template <typename Cmpi> const typename Traits<Cmpi>::Content& look(const Cmpi* object) {
     const Object* const known = BrokerState::objectAt(object);
-    if (known == nullptr || known->kind != Traits<Cmpi>::kind)
+    if (known == nullptr || known->kind != Traits<Cmpi>::kind) {
         giveUp(std::string("inspect: not a ") + kindName(Traits<Cmpi>::kind) + " of a broker");
-    if (known->life == Life::Ended || !known->hasHandle())
+    }
+    if (known->life == Life::Ended || !known->hasHandle()) {
         giveUp("inspect: the object has ended or has no handle");
+    }
     return *static_cast<const ObjectOf<Cmpi>*>(known)->content;
 }
 
@@ -111,14 +113,16 @@ Outcome RecordingBroker::outcomeOf(const CMPIStatus& status) {
     Outcome outcome;
     outcome.rc = status.rc;
     outcome.hasMessage = status.msg != nullptr;
-    if (!outcome.hasMessage)
+    if (!outcome.hasMessage) {
         return outcome;
+    }
     const Object* const known = BrokerState::objectAt(status.msg);
     if (known == nullptr || known->kind != Kind::String || known->life == Life::Ended ||
-        !known->hasHandle())
+        !known->hasHandle()) {
         state_->violate("status: the message is no live CMPIString");
-    else
+    } else {
         outcome.message = *static_cast<const ObjectOf<CMPIString>*>(known)->content;
+    }
     return outcome;
 }
 
@@ -139,8 +143,9 @@ unsigned RecordingBroker::callCount() const {
 
 unsigned RecordingBroker::callCount(std::string_view slot) const {
     const Lock lock(BrokerState::mutex());
-    if (!isSlotName(slot))
+    if (!isSlotName(slot)) {
         giveUp("there is no slot '" + std::string(slot) + "'");
+    }
     const auto& counts = state_->current().countBySlot;
     const auto found = counts.find(slot);
     return found == counts.end() ? 0 : found->second;

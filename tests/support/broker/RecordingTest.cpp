@@ -33,8 +33,9 @@ template <typename Table> bool isComplete(const Table* table, std::size_t firstS
     for (std::size_t at = firstSlot; at < sizeof(Table); at += sizeof(void*)) {
         void* slot = nullptr;
         std::memcpy(&slot, bytes + at, sizeof slot);
-        if (slot == nullptr)
+        if (slot == nullptr) {
             return false;
+        }
     }
     return true;
 }
@@ -243,13 +244,16 @@ TEST_F(RecordingTest, The_systems_services_run_threads_and_keep_locks) {
 
 TEST_F(RecordingTest, Calls_of_several_threads_are_all_recorded) {
     std::vector<std::thread> threads;
-    for (int i = 0; i < 4; ++i)
+    for (int i = 0; i < 4; ++i) {
         threads.emplace_back([this] {
-            for (int k = 0; k < 100; ++k)
+            for (int k = 0; k < 100; ++k) {
                 CMGetCharPtr(CMNewString(mb_, "x", nullptr));
+            }
         });
-    for (std::thread& thread : threads)
+    }
+    for (std::thread& thread : threads) {
         thread.join();
+    }
     EXPECT_EQ(broker_.callCount("newString"), 400u);
     EXPECT_EQ(broker_.callCount(), 800u);
 }

@@ -6,8 +6,9 @@ namespace {
 
 const char* getCharPtr(const CMPIString* self, CMPIStatus* st) {
     Call call("getCharPtr", self, st);
-    if (!call.begin())
+    if (!call.begin()) {
         return nullptr;
+    }
     return call.content<CMPIString>().c_str();
 }
 

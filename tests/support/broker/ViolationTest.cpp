@@ -82,8 +82,9 @@ TEST_F(ViolationTest, An_object_used_after_its_call) {
 TEST_F(ViolationTest, An_object_used_many_calls_later_is_at_least_unknown) {
     const CMPIString* const string = CMNewString(mb_, "x", nullptr);
     const CMPIStringFT* const table = string->ft;
-    for (int i = 0; i < 20; ++i)
+    for (int i = 0; i < 20; ++i) {
         broker_.beginCall();
+    }
     EXPECT_EQ(table->getCharPtr(string, nullptr), nullptr);
     EXPECT_EQ(broker_.violations().size(), 1u);
 }

@@ -4,7 +4,6 @@
 
 #include <sstream>
 
-using qelo::test::LogLine;
 using qelo::test::RecordingPort;
 using qelo::test::Sink;
 

@@ -44,9 +44,15 @@ bool hasValue(const CMPIData& argument) {
     return (argument.state & (CMPI_nullValue | CMPI_badValue)) == 0;
 }
 
+// The text of a string; empty for none. `status` receives that of reading it.
+const char* readText(const CMPIString* string, CMPIStatus* status) {
+    const char* text = isNull(string) ? nullptr : string->ft->getCharPtr(string, status);
+    return text != nullptr ? text : "";
+}
+
 // The text of a string argument; empty for a null value.
-const char* stringOf(const CMPIData& argument) {
-    return hasValue(argument) ? textOf(argument.value.string) : "";
+const char* stringOf(const CMPIData& argument, CMPIStatus* status) {
+    return hasValue(argument) ? readText(argument.value.string, status) : "";
 }
 
 std::string numberOf(const CMPIData& argument) {
@@ -54,17 +60,19 @@ std::string numberOf(const CMPIData& argument) {
     return hasValue(argument) ? std::to_string(static_cast<int>(argument.value.uint32)) : "";
 }
 
-const char* dateOf(const CMPIData& argument) {
+const char* dateOf(const CMPIData& argument, CMPIStatus* status) {
     const CMPIDateTime* date = hasValue(argument) ? argument.value.dateTime : nullptr;
-    return isNull(date) ? "" : textOf(CMGetStringFormat(date, nullptr));
+    const CMPIString* format = isNull(date) ? nullptr : CMGetStringFormat(date, status);
+    return status->rc == CMPI_RC_OK ? readText(format, status) : "";
 }
 
-// Appends the type and the value of one argument; false when the gate refuses it.
-bool appendValue(CommandText& command, const CMPIData& argument) {
+// Appends the type and the value of one argument; false when the gate refuses it. `status`
+// receives that of reading the value.
+bool appendValue(CommandText& command, const CMPIData& argument, CMPIStatus* status) {
     switch (argument.type) {
     case CMPI_string: {
         command << ":CMPI_string";
-        Secret value{stringOf(argument)};
+        Secret value{stringOf(argument, status)};
         if (!ProviderUtilities::ValidateInput(value.text, "")) {
             return false;
         }
@@ -75,7 +83,7 @@ bool appendValue(CommandText& command, const CMPIData& argument) {
         command << ":CMPI_uint32:" << numberOf(argument).c_str();
         return true;
     case CMPI_dateTime:
-        command << ":CMPI_dateTime:" << dateOf(argument);
+        command << ":CMPI_dateTime:" << dateOf(argument, status);
         return true;
     default:
         return true;
@@ -93,14 +101,14 @@ bool packCommand(const char* methodName, const CMPIArgs* in, std::string& comman
         CMPIString* name = nullptr;
         const CMPIData argument = CMGetArgAt(in, i, &name, &status);
         if (status.rc == CMPI_RC_OK) {
-            text << "," << textOf(name);
-            if (!appendValue(text, argument)) {
-                return false;
-            }
+            text << "," << readText(name, &status);
+        }
+        if (status.rc == CMPI_RC_OK && !appendValue(text, argument, &status)) {
+            return false;
         }
     }
     command = text.text();
-    // A command that lacks an argument may mean another thing; better none.
+    // A command that lacks an argument, or the text of one, may mean another thing; better none.
     return status.rc == CMPI_RC_OK;
 }
 

@@ -95,9 +95,9 @@ std::shared_ptr<const Snapshot> AccountSource::take() {
 
 #ifdef QELO_WITH_COMMANDS
 bool AccountSource::execute(const std::string& command, std::string& status) {
-    const qelo::store::CommandOutcome outcome = qelo::store::executeAdminCommand(root_, command);
+    qelo::store::CommandOutcome outcome = qelo::store::executeAdminCommand(root_, command);
     if (outcome.accepted) {
-        status = outcome.status;
+        status = std::move(outcome.status);
     }
     return outcome.accepted;
 }

@@ -7,6 +7,7 @@
 
 #include <algorithm>
 #include <exception>
+#include <new>
 
 namespace qelo::nodes {
 
@@ -78,8 +79,13 @@ bool NodeCursor::read(int id, std::string& value) const {
     if (id != AdminCommand || !status_) {
         return readNode(id, value);
     }
-    value = *status_;
-    return true;
+    try {
+        value = *status_;
+        return true;
+    } catch (const std::bad_alloc&) {
+        // The command is done: better no text than word of a failure.
+        return false;
+    }
 }
 
 bool NodeCursor::countNow(unsigned int& value) const {

@@ -6,6 +6,7 @@
 
 #include <exception>
 #include <new>
+#include <utility>
 
 namespace qelo::store {
 
@@ -22,9 +23,8 @@ CommandOutcome fail(const std::string& reason) {
 
 CommandOutcome executeAdminCommand(const std::filesystem::path& root, const std::string& command) {
     try {
-        const Attempt<std::string> status =
-            executeCommand(root, command, systemFiles(), systemTools());
-        return status ? CommandOutcome{true, *status} : fail(status.reason());
+        Attempt<std::string> status = executeCommand(root, command, systemFiles(), systemTools());
+        return status ? CommandOutcome{true, std::move(*status)} : fail(status.reason());
     } catch (const std::bad_alloc&) {
         throw;
     } catch (const std::exception&) {

@@ -7,12 +7,17 @@
 #include "ToolRests.h"
 #include "UserCommands.h"
 
+#include <new>
+
 namespace qelo::store {
 
 namespace {
 
 // Long enough for many commands that each wait for somebody else's tool.
 constexpr std::chrono::minutes kLockLimit{5};
+
+// So short that a string of it needs no memory.
+constexpr const char* kShortStatus = "Done.";
 
 Attempt<std::string> dispatch(const Workplace& workplace, const CommandRequest& request,
                               const Secret* hash) {
@@ -52,6 +57,22 @@ Attempt<Secret> takeHash(CommandRequest& request) {
     return hash;
 }
 
+// When the memory is too short to tell what was done, it is done all the same.
+Attempt<std::string> carryOutLocked(const RootDirectory& root, const CommandRequest& request,
+                                    const Secret* hash, FileSystem& files, ToolRunner& tools) {
+    bool done = false;
+    try {
+        Attempt<std::string> status = dispatch({root, files, tools, &done}, request, hash);
+        removeToolRests(root, files);
+        return status;
+    } catch (const std::bad_alloc&) {
+        if (!done) {
+            throw;
+        }
+    }
+    return std::string(kShortStatus);
+}
+
 Attempt<std::string> carryOut(const std::filesystem::path& rootPath, CommandRequest& request,
                               FileSystem& files, ToolRunner& tools) {
     const Attempt<Secret> hash = takeHash(request);
@@ -66,10 +87,7 @@ Attempt<std::string> carryOut(const std::filesystem::path& rootPath, CommandRequ
     if (!lock) {
         return lock.refusal();
     }
-    Attempt<std::string> status =
-        dispatch({*root, files, tools}, request, hash->empty() ? nullptr : &*hash);
-    removeToolRests(*root, files);
-    return status;
+    return carryOutLocked(*root, request, hash->empty() ? nullptr : &*hash, files, tools);
 }
 
 } // namespace
@@ -84,10 +102,11 @@ Attempt<std::string> executeCommand(const std::filesystem::path& root, std::stri
     if (!request) {
         return request.refusal();
     }
-    const Attempt<std::string> status = carryOut(root, *request, files, tools);
-    return status ? status
-                  : Attempt<std::string>(
-                        Refusal{std::string(nameOf(request->method)) + ": " + status.reason()});
+    Attempt<std::string> status = carryOut(root, *request, files, tools);
+    if (!status) {
+        return Refusal{std::string(nameOf(request->method)) + ": " + status.reason()};
+    }
+    return status;
 }
 
 } // namespace qelo::store

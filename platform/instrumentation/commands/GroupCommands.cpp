@@ -26,7 +26,7 @@ Problem carryOut(const Workplace& workplace, const GroupStep& step) {
     if (!before) {
         return before.reason();
     }
-    Rollback rollback;
+    Rollback rollback(workplace);
     rollback.add([&] { return before->restore(); });
     if (Problem problem = step.run(AccountTools(workplace))) {
         return rollback.undo(*problem).reason;

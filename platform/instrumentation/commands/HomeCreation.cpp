@@ -2,6 +2,7 @@
 
 #include <cerrno>
 #include <fcntl.h>
+#include <new>
 #include <unistd.h>
 
 namespace qelo::store {
@@ -14,6 +15,45 @@ bool isOwnDirectory(const struct stat& status) {
     return (status.st_uid == 0 || status.st_uid == ::geteuid()) &&
            (!shared || (status.st_mode & S_ISVTX) != 0);
 }
+
+// A directory in the making: it goes with its owner unless it has been given its name.
+class Draft {
+public:
+    Draft(FileSystem& files, int parent)
+        : files_(files), parent_(parent), name_(".qelosim-new-" + std::to_string(::getpid())) {}
+    ~Draft() {
+        if (made_) {
+            try {
+                bool removed = false;
+                removeTree(files_, parent_, name_, removed);
+            } catch (const std::bad_alloc&) {
+                return; // it stays until the next of this number
+            }
+        }
+    }
+    Draft(const Draft&) = delete;
+    Draft& operator=(const Draft&) = delete;
+
+    // Nothing but a killed process of this number can have left one; it is not ours to keep.
+    bool make() {
+        bool removed = false;
+        made_ = files_.makeDirectory(parent_, name_, 0700) ||
+                (errno == EEXIST && !removeTree(files_, parent_, name_, removed) &&
+                 files_.makeDirectory(parent_, name_, 0700));
+        return made_;
+    }
+    Descriptor open() { return files_.open(parent_, name_, O_RDONLY | O_DIRECTORY); }
+    bool giveName(const std::string& name) {
+        made_ = !files_.rename(parent_, name_, parent_, name);
+        return !made_;
+    }
+
+private:
+    FileSystem& files_;
+    int parent_;
+    std::string name_;
+    bool made_ = false;
+};
 
 } // namespace
 
@@ -60,29 +100,18 @@ Problem NewHome::fill(int directory, Owner owner, const RootSettings& settings) 
 }
 
 Problem NewHome::build(const Place& place, Owner owner, const RootSettings& settings) {
-    FileSystem& files = workplace_.files;
-    const int parent = place.parent.get();
-    // Nothing but a killed process of this number can have left one; it is not ours to keep.
-    const std::string draft = ".qelosim-new-" + std::to_string(::getpid());
-    bool removed = false;
-    if (!files.makeDirectory(parent, draft, 0700) &&
-        (errno != EEXIST || removeTree(files, parent, draft, removed) ||
-         !files.makeDirectory(parent, draft, 0700))) {
+    Draft draft(workplace_.files, place.parent.get());
+    if (!draft.make()) {
         return "the home directory cannot be made";
     }
-    Problem problem;
-    {
-        const Descriptor directory = files.open(parent, draft, O_RDONLY | O_DIRECTORY);
-        problem = directory ? fill(directory.get(), owner, settings)
-                            : Problem("the home directory cannot be opened");
+    const Descriptor directory = draft.open();
+    if (!directory) {
+        return "the home directory cannot be opened";
     }
-    if (!problem && !files.rename(parent, draft, parent, place.name)) {
-        problem = "the home directory cannot be named";
+    if (Problem problem = fill(directory.get(), owner, settings)) {
+        return problem;
     }
-    if (problem) {
-        removeTree(files, parent, draft, removed);
-    }
-    return problem;
+    return draft.giveName(place.name) ? Problem() : Problem("the home directory cannot be named");
 }
 
 Problem NewHome::make(const std::string& path, Owner owner, const RootSettings& settings) {

@@ -105,9 +105,9 @@ Problem OldHome::setAside() {
     if (!files.rename(parent, place_->name, parent, name)) {
         return "the home directory cannot be renamed";
     }
-    aside_ = name;
+    aside_ = std::move(name);
     // Whoever may write to the parent could have exchanged it since it was looked at.
-    if (!files.statusAt(parent, name, found) || !isSameFile(found, status_)) {
+    if (!files.statusAt(parent, aside_, found) || !isSameFile(found, status_)) {
         putBack();
         return "the home directory was exchanged meanwhile";
     }

@@ -81,11 +81,12 @@ private:
             missing_ = true;
             return "a directory on the path is missing";
         }
-        MadeDirectory made{duplicate(current()), part};
-        if (!made.parent || !files_.makeDirectory(current(), part, 0700)) {
+        // Noted first: what is made must be known even when there is no memory to note it.
+        made_->push_back({duplicate(current()), part});
+        if (!made_->back().parent || !files_.makeDirectory(current(), part, 0700)) {
+            made_->pop_back();
             return "a directory on the path cannot be made";
         }
-        made_->push_back(std::move(made));
         if (Problem problem = descend(part)) {
             return problem;
         }

@@ -13,6 +13,13 @@ Rollback::~Rollback() {
     }
 }
 
+void Rollback::dismiss() noexcept {
+    steps_.clear();
+    if (done_ != nullptr) {
+        *done_ = true;
+    }
+}
+
 Refusal Rollback::undo(const std::string& why) {
     std::string reason = why;
     while (!steps_.empty()) {

@@ -2,6 +2,7 @@
 #pragma once
 
 #include "Attempt.h"
+#include "Workplace.h"
 
 #include <functional>
 #include <vector>
@@ -10,7 +11,7 @@ namespace qelo::store {
 
 class Rollback {
 public:
-    Rollback() = default;
+    explicit Rollback(const Workplace& workplace) : done_(workplace.done) {}
     // Undoes too: an exception (there is no memory left) must not leave half a change.
     ~Rollback();
     Rollback(const Rollback&) = delete;
@@ -19,8 +20,8 @@ public:
     // `step` is to undo what comes next, however much of that is done by then.
     void add(std::function<Problem()> step) { steps_.push_back(std::move(step)); }
 
-    // The command is done: nothing is to be undone.
-    void dismiss() { steps_.clear(); }
+    // The command is done: nothing is to be undone, and the workplace notes it.
+    void dismiss() noexcept;
 
     // Undoes everything, last step first, and gives the reason for the caller's refusal:
     // `why`, and what could not be undone.
@@ -28,6 +29,7 @@ public:
 
 private:
     std::vector<std::function<Problem()>> steps_;
+    bool* done_;
 };
 
 } // namespace qelo::store

@@ -222,7 +222,7 @@ Problem change(const Workplace& workplace, const CommandRequest& request, const 
         return before.reason();
     }
     Modification modification(workplace, request, account, hash);
-    Rollback rollback;
+    Rollback rollback(workplace);
     rollback.add([&] { return before->restore(); });
     rollback.add([&] { return modification.undo(); });
     if (Problem problem = modification.run()) {

@@ -99,7 +99,7 @@ Attempt<std::string> createUser(const Workplace& workplace, const CommandRequest
     }
     NewMailFile mail(workplace, settings->mailDirectory, request.name);
     NewHome home(workplace);
-    Rollback rollback;
+    Rollback rollback(workplace);
     rollback.add([&] { return mail.undo(); });
     rollback.add([&] { return before->restore(); });
     rollback.add([&] { return home.undo(); });

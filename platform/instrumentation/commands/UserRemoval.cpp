@@ -6,6 +6,8 @@
 #include "HomeRemoval.h"
 #include "Rollback.h"
 
+#include <new>
+
 namespace qelo::store {
 
 namespace {
@@ -22,13 +24,25 @@ Problem deleteAccount(const Workplace& workplace, const std::string& name) {
     return database->hasAccountName(name) ? Problem("the account is still there") : Problem();
 }
 
+// A home directory of which something is gone cannot be put back, whatever stopped it.
+Problem destroy(OldHome& home, bool& removed) {
+    try {
+        return home.destroy(removed);
+    } catch (const std::bad_alloc&) {
+        if (!removed) {
+            throw;
+        }
+        return "no memory"; // so short that it needs none
+    }
+}
+
 Attempt<std::string> remove(const Workplace& workplace, const std::string& name, OldHome& home) {
     const Attempt<EntrySnapshot> before =
         EntrySnapshot::take(workplace.root, workplace.files, name, name);
     if (!before) {
         return before.refusal();
     }
-    Rollback rollback;
+    Rollback rollback(workplace);
     rollback.add([&] { return before->restore(); });
     rollback.add([&] { return home.putBack(); });
     Problem problem = home.setAside();
@@ -39,7 +53,7 @@ Attempt<std::string> remove(const Workplace& workplace, const std::string& name,
         return rollback.undo(*problem);
     }
     bool removed = false;
-    problem = home.destroy(removed);
+    problem = destroy(home, removed);
     if (problem && !removed) {
         return rollback.undo("the home directory: " + *problem);
     }

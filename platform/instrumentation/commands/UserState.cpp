@@ -24,7 +24,7 @@ Problem changeLock(const Workplace& workplace, const std::string& name,
     if (!before) {
         return before.reason();
     }
-    Rollback rollback;
+    Rollback rollback(workplace);
     rollback.add([&] { return before->restore(); });
     if (Problem problem = step(AccountTools(workplace))) {
         return rollback.undo(*problem).reason;

@@ -11,6 +11,9 @@ struct Workplace {
     const RootDirectory& root;
     FileSystem& files;
     ToolRunner& tools;
+    // Where it is noted, if anywhere, that the command has come to its end: what goes wrong from
+    // then on must not be told as if nothing had changed.
+    bool* done = nullptr;
 };
 
 } // namespace qelo::store

@@ -238,10 +238,16 @@ client::Arguments argumentsOf(const Request& request) {
     return arguments;
 }
 
+// How the store says that a failed command has left something behind, as on a full disk.
+constexpr const char* kNotUndone = "; not undone: ";
+
 // The provider answers every refusal with the same words. Why stands in the store's log line,
 // which this process can overhear when the store is its own.
 [[noreturn]] void fail(const CommandContext& context, const client::CimError& error) {
     const std::string reason = context.refusalReason();
+    if (reason.find(kNotUndone) != std::string::npos) {
+        throw client::CimError(error.code(), "failed, and not all could be put back: " + reason);
+    }
     throw client::CimError(
         error.code(),
         "refused or failed, nothing was changed" +

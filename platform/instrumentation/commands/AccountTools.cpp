@@ -4,6 +4,7 @@
 #include "FieldRules.h"
 
 #include <algorithm>
+#include <array>
 #include <ctime>
 #include <thread>
 
@@ -42,9 +43,21 @@ void addOption(std::vector<std::string>& options, const char* name, const std::o
     }
 }
 
+bool says(const ToolResult& result, const char* text) {
+    return result.message.find(text) != std::string::npos;
+}
+
+// Why no lock can be made, whoever else holds it; in the tools' language (see ToolRunner.h).
+bool leavesNoHope(const ToolResult& result) {
+    constexpr std::array<const char*, 3> kReasons{"No space left on device", "Disk quota exceeded",
+                                                  "Read-only file system"};
+    return std::any_of(kReasons.begin(), kReasons.end(),
+                       [&](const char* reason) { return says(result, reason); });
+}
+
 bool onlyFailedToLock(const ToolResult& result) {
     return result.end == ToolResult::End::Exited && result.code != 0 &&
-           result.message.find("cannot lock") != std::string::npos;
+           says(result, "cannot lock") && !leavesNoHope(result);
 }
 
 std::string firstLine(const std::string& text) { return text.substr(0, text.find('\n')); }

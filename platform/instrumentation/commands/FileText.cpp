@@ -80,9 +80,11 @@ Problem writeNewFile(FileSystem& files, int directory, const std::string& name,
     return {};
 }
 
+std::string draftOf(const std::string& name) { return "." + name + ".qelosim"; }
+
 Problem replaceFile(FileSystem& files, int directory, const std::string& name,
                     std::string_view text) {
-    const std::string fresh = "." + name + ".qelosim";
+    const std::string fresh = draftOf(name);
     struct stat model {};
     if (!files.statusAt(directory, name, model) || !S_ISREG(model.st_mode)) {
         return "cannot find " + name;

@@ -22,6 +22,9 @@ Problem writeNewFile(FileSystem& files, int directory, const std::string& name,
 Problem replaceFile(FileSystem& files, int directory, const std::string& name,
                     std::string_view text);
 
+// The name of a file's new content until it is in place. A process that is killed may leave it.
+std::string draftOf(const std::string& name);
+
 // Removes a file that must not stay, such as a lock: tries again when it does not go.
 void removeSurely(FileSystem& files, int directory, const std::string& name);
 

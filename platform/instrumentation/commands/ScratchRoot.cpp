@@ -8,6 +8,7 @@
 #include <array>
 #include <cerrno>
 #include <fcntl.h>
+#include <sys/file.h>
 
 namespace qelo::store {
 
@@ -114,17 +115,21 @@ bool isFree(FileSystem& files, int parent, const std::string& name) {
     return files.list(directory.get(), names) && names.empty();
 }
 
-Problem makeEtc(FileSystem& files, int top) {
-    if (!isFree(files, top, "etc")) {
-        return "there is an etc already";
-    }
+// Makes the directory in which etc comes into being. One that is there was left by a process
+// that was killed, as the top directory is locked.
+Descriptor makeDraft(FileSystem& files, int top) {
+    Descriptor draft = makeAndOpen(files, top, kDraft);
     bool removed = false;
-    Problem problem;
-    {
-        const Descriptor etc = makeAndOpen(files, top, kDraft);
-        if (!etc) {
-            return cannotMake("etc");
-        }
+    if (!draft && errno == EEXIST && !removeTree(files, top, kDraft, removed)) {
+        draft = makeAndOpen(files, top, kDraft);
+    }
+    return draft;
+}
+
+Problem makeEtc(FileSystem& files, int top) {
+    bool removed = false;
+    Problem problem = cannotMake("etc");
+    if (const Descriptor etc = makeDraft(files, top)) {
         problem = fillEtc(files, etc.get());
     }
     if (!problem && !files.rename(top, kDraft, top, "etc")) {
@@ -136,9 +141,37 @@ Problem makeEtc(FileSystem& files, int top) {
     return problem;
 }
 
-Problem makeHome(FileSystem& files, int top) {
-    const Descriptor home = makeAndOpen(files, top, "home");
-    return home || errno == EEXIST ? Problem() : cannotMake("home");
+// `made` tells whether there was none.
+Problem makeHome(FileSystem& files, int top, bool& made) {
+    made = files.makeDirectory(top, "home", 0755);
+    if (!made) {
+        return errno == EEXIST ? Problem() : cannotMake("home");
+    }
+    const Descriptor home = files.open(top, "home", kOpenDirectory);
+    if (home && files.changeMode(home.get(), 0755)) {
+        return {};
+    }
+    files.removeDirectory(top, "home");
+    return cannotMake("home");
+}
+
+// The etc comes last: with it, there is a root.
+Problem fillRoot(FileSystem& files, int top) {
+    if (::flock(top, LOCK_EX | LOCK_NB) != 0) {
+        return "the directory cannot be locked";
+    }
+    if (!isFree(files, top, "etc")) {
+        return "there is an etc already";
+    }
+    bool madeHome = false;
+    if (Problem problem = makeHome(files, top, madeHome)) {
+        return problem;
+    }
+    Problem problem = makeEtc(files, top);
+    if (problem && madeHome) {
+        files.removeDirectory(top, "home");
+    }
+    return problem;
 }
 
 Problem makeRoot(const std::filesystem::path& path, FileSystem& files) {
@@ -148,10 +181,7 @@ Problem makeRoot(const std::filesystem::path& path, FileSystem& files) {
     if (error || !top || path.native().find('\0') != std::string::npos) {
         return "the directory cannot be made or opened";
     }
-    if (Problem problem = makeEtc(files, top.get())) {
-        return problem;
-    }
-    return makeHome(files, top.get());
+    return fillRoot(files, top.get());
 }
 
 } // namespace

@@ -1,5 +1,5 @@
-// What account tools leave behind in the directory of the account files when one of their own
-// system calls fails, or when they are killed.
+// What account tools, and this store, leave behind in the directory of the account files when one
+// of their own system calls fails, or when they are killed.
 #pragma once
 
 #include "FileSystem.h"
@@ -8,7 +8,7 @@
 namespace qelo::store {
 
 // Removes locks of processes that are gone, and new versions of account files ("shadow+") that
-// no tool is writing. What cannot be removed stays: it harms nobody. The store's own lock has
+// nobody is writing. What cannot be removed stays: it harms nobody. The store's own lock has
 // to be held.
 void removeToolRests(const RootDirectory& root, FileSystem& files);
 

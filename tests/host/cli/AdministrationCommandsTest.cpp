@@ -170,6 +170,17 @@ TEST_F(AdministrationCommands, A_refusal_is_told_with_its_reason_where_that_is_k
     EXPECT_EQ(output.text(), "");
 }
 
+TEST_F(AdministrationCommands, What_could_not_be_undone_is_told) {
+    manager.failWith(client::CimError(1, "Execute Method Failed"));
+    refusalReason = [] {
+        return std::string("DeleteUser: userdel was killed; not undone: cannot lock etc/passwd");
+    };
+    EXPECT_EQ(run({"delete-user", "al"}), 1);
+    EXPECT_EQ(errors.text(), "qelosim: delete-user: failed, and not all could be put back: "
+                             "DeleteUser: userdel was killed; not undone: cannot lock etc/passwd "
+                             "(CIM_ERR_FAILED, 1)\n");
+}
+
 TEST_F(AdministrationCommands, A_refusal_without_a_known_reason_points_at_the_log) {
     manager.failWith(client::CimError(1, "Execute Method Failed"));
     const std::string expected =

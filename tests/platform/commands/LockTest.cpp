@@ -1,6 +1,7 @@
 // Who waits for whom.
 #include "AccountFileLock.h"
 #include "AccountTable.h"
+#include "CommandExecutor.h"
 #include "CommandTest.h"
 #include "PosixFileSystem.h"
 #include "StoreLock.h"
@@ -122,6 +123,30 @@ TEST_F(Lock, That_cannot_be_understood_counts_as_held) {
         EXPECT_FALSE(AccountFileLock::take(*opened_, files_, "shadow", milliseconds(50))) << text;
     }
     fs::remove(etc("shadow.lock"));
+}
+
+namespace {
+
+// Says what the tools say when they cannot write their number into a lock.
+class FullDisk : public store::ToolRunner {
+public:
+    store::ToolResult run(const store::ToolCall&) override {
+        ++runs;
+        return {store::ToolResult::End::Exited, 10,
+                "groupadd: /etc/group.7 file write error: No space left on device\n"
+                "groupadd: cannot lock /etc/group; try again later.\n"};
+    }
+
+    int runs = 0;
+};
+
+} // namespace
+
+TEST_F(Lock, That_cannot_be_made_is_not_waited_for) {
+    FullDisk tools;
+    EXPECT_FALSE(store::executeCommand(root(), command("CreateGroup", {text("Name", "devs")}),
+                                       files_, tools));
+    EXPECT_EQ(1, tools.runs);
 }
 
 TEST_F(Lock, A_command_waits_for_a_tool_that_holds_an_account_file) {

@@ -61,6 +61,16 @@ TEST(ScratchRoot, Keeps_what_is_there) {
     EXPECT_EQ(before, stateOf(scratch.path()));
 }
 
+TEST(ScratchRoot, Is_made_where_an_earlier_command_was_killed) {
+    const ScratchDirectory scratch;
+    fs::create_directories(scratch.path() / ".etc.qelosim/skel");
+    write(scratch.path() / ".etc.qelosim/passwd", "root:x:");
+    const store::CommandOutcome made = store::initRoot(scratch.path());
+    EXPECT_TRUE(made.accepted) << made.status;
+    EXPECT_FALSE(fs::exists(scratch.path() / ".etc.qelosim"));
+    EXPECT_THAT(findFaults(scratch.path()), testing::IsEmpty());
+}
+
 TEST(ScratchRoot, Is_refused_where_an_etc_holds_anything_or_leads_elsewhere) {
     const ScratchDirectory scratch;
     const ScratchDirectory elsewhere;

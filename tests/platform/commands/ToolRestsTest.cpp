@@ -31,6 +31,17 @@ TEST_F(ToolRests, Of_processes_that_are_gone_are_removed) {
     EXPECT_FALSE(isThere("gshadow+"));
 }
 
+TEST_F(ToolRests, Of_processes_that_were_killed_while_writing_are_removed) {
+    const std::vector<std::string> rests{"group." + kNobody, ".shadow.qelosim"};
+    for (const std::string& name : rests) {
+        leave(name, "");
+    }
+    accept("CreateGroup", {text("Name", "devs")});
+    for (const std::string& name : rests) {
+        EXPECT_FALSE(isThere(name)) << name;
+    }
+}
+
 TEST_F(ToolRests, Are_removed_after_a_refused_command_too) {
     leave("shadow+", "half of a");
     EXPECT_FALSE(run("CreateGroup", {text("Name", "root")}).accepted);

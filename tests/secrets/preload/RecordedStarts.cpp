@@ -54,9 +54,10 @@ void record(const char* what, const char* program, char* const* arguments,
 __attribute__((constructor)) void begin(int, char** arguments, char** environment) {
     if (const char* const path = std::getenv("QELO_RECORDED_STARTS")) {
         std::strncpy(recordPath, path, sizeof recordPath - 1);
-        // The one that may be given passwords hides them itself, and later.
-        const bool ours = std::strcmp(program_invocation_short_name, "qelosim") == 0;
-        record("begins", arguments[0], ours ? nullptr : arguments, environment);
+        // These are given passwords: the first hides them, a little later, the other does not.
+        const char* const name = program_invocation_short_name;
+        const bool given = std::strcmp(name, "qelosim") == 0 || std::strcmp(name, "wbemcli") == 0;
+        record("begins", arguments[0], given ? nullptr : arguments, environment);
     }
 }
 

@@ -2,58 +2,14 @@
 
 #include <algorithm>
 #include <functional>
-#include <random>
 
 namespace qelo::test {
 
 namespace {
 
-using Files = std::map<std::string, std::string>;
-using Fields = std::vector<std::string>;
 using Place = DamagedDatabase::Place;
 
 constexpr std::size_t kHuge = 300'000;
-
-// The lines of the victim, by file.
-const std::map<std::string, Fields>& victims() {
-    static const std::map<std::string, Fields> lines = {
-        {"passwd", {"victim", "x", "1001", "1001", "Victim,Room 7,,", "/home/victim", "/bin/sh"}},
-        {"shadow", {"victim", "$y$j9T$salt$hash", "19000", "0", "99999", "7", "30", "25000", ""}},
-        {"group", {"victim", "x", "1001", "first,last"}},
-        {"gshadow", {"victim", "!", "first", "first,last"}}};
-    return lines;
-}
-
-const std::map<std::string, std::pair<std::string, std::string>>& frames() {
-    static const std::map<std::string, std::pair<std::string, std::string>> lines = {
-        {"passwd",
-         {"first:x:1000:1000:First:/home/first:/bin/bash\n",
-          "last:x:1002:1002:Last:/home/last:/bin/zsh\n"}},
-        {"shadow", {"first:*:19000:0:99999:7:::\n", "last:!:19000:0:99999:7:::\n"}},
-        {"group", {"first:x:1000:\n", "last:x:1002:first\n"}},
-        {"gshadow", {"first:!::\n", "last:!::first\n"}}};
-    return lines;
-}
-
-std::string joined(const Fields& fields) {
-    std::string line;
-    for (std::size_t i = 0; i < fields.size(); ++i) {
-        line += (i == 0 ? "" : ":") + fields[i];
-    }
-    return line;
-}
-
-// The files with that text where the victim's line of one of them is.
-Files filesWith(const std::string& file, const std::string& between) {
-    Files files;
-    for (const auto& [name, frame] : frames()) {
-        const std::string line = name == file ? between : joined(victims().at(name)) + "\n";
-        files[name] = frame.first + line + frame.second;
-    }
-    return files;
-}
-
-Files undamaged() { return filesWith("", ""); }
 
 // What a field of the victim may hold, with a word for each.
 std::vector<std::pair<std::string, std::string>> badValues() {
@@ -75,6 +31,10 @@ std::vector<std::pair<std::string, std::string>> badValues() {
             {"carriage return", "1\r"},
             {"formats", "%s%n%d%99999d"},
             {"markup", "<a href=\"x\">&amp;</a>"},
+            {"the first's name", "first"},
+            {"the last's name", "last"},
+            {"the first's number", "1000"},
+            {"the last's number", "1002"},
             {"commas", std::string(5000, ',')},
             {"the same name over and over", [] {
                  std::string names = "first";
@@ -85,14 +45,39 @@ std::vector<std::pair<std::string, std::string>> badValues() {
              }()}};
 }
 
+// What the rules of a file are told by.
+std::set<std::string> propertiesOf(const std::string& file) {
+    const std::string history = "PasswordHistoryDepth";
+    const std::string rules = "ComplexPasswordRulesEnforced";
+    if (file == kFaillock) {
+        return {"MaximumSuccessiveLoginFailures"};
+    }
+    if (file == kPwhistory) {
+        return {history};
+    }
+    if (file == kPwquality) {
+        return {rules};
+    }
+    return file == kCommonPassword ? std::set<std::string>{history, rules}
+                                   : std::set<std::string>{};
+}
+
+DamagedDatabase& add(std::vector<DamagedDatabase>& all, const std::string& file,
+                     const std::string& word, const Files& files) {
+    all.push_back({file + ", " + word, files});
+    all.back().open = propertiesOf(file);
+    all.back().isRead = file != "gshadow";
+    return all.back();
+}
+
 void addFields(std::vector<DamagedDatabase>& all) {
     for (const auto& [file, fields] : victims()) {
         for (std::size_t i = 0; i < fields.size(); ++i) {
             for (const auto& [word, value] : badValues()) {
                 Fields damaged = fields;
                 damaged[i] = value;
-                all.push_back({file + ", field " + std::to_string(i) + ", " + word,
-                               filesWith(file, joined(damaged) + "\n")});
+                add(all, file, "field " + std::to_string(i) + ", " + word,
+                    filesWith(file, joined(damaged) + "\n"));
             }
         }
     }
@@ -125,11 +110,11 @@ void addLines(std::vector<DamagedDatabase>& all) {
             {"line is huge", std::string(kHuge, ':') + "\n"},
             {"name is first's", "first" + line.substr(line.find(':')) + "\n"}};
         for (const auto& [word, between] : damages) {
-            all.push_back({file + ", " + word, filesWith(file, between)});
+            add(all, file, word, filesWith(file, between));
         }
         for (std::size_t length = 1; length < line.size(); length += 3) {
-            all.push_back({file + ", line ends after " + std::to_string(length) + " bytes",
-                           filesWith(file, line.substr(0, length) + "\n")});
+            add(all, file, "line ends after " + std::to_string(length) + " bytes",
+                filesWith(file, line.substr(0, length) + "\n"));
         }
     }
 }
@@ -150,24 +135,22 @@ void loseLast(DamagedDatabase& database, const std::string& file) {
 
 void addWhole(std::vector<DamagedDatabase>& all, const std::string& file, const std::string& word,
               const std::function<void(std::string&)>& damage, bool readable) {
-    DamagedDatabase database{file + " " + word, undamaged()};
+    DamagedDatabase& database = add(all, file, word, undamagedFiles());
     damage(database.files[file]);
     if (!readable) {
         loseAll(database, file);
     }
-    all.push_back(database);
 }
 
 void addPlaces(std::vector<DamagedDatabase>& all, const std::string& file) {
     for (const Place place :
          {Place::Directory, Place::Pipe, Place::LoopingLink, Place::Unreadable}) {
-        DamagedDatabase database{file + " is of kind " + std::to_string(static_cast<int>(place)),
-                                 undamaged()};
+        DamagedDatabase& database = add(
+            all, file, "is of kind " + std::to_string(static_cast<int>(place)), undamagedFiles());
         database.place = place;
         database.placeOf = file;
         database.files.erase(file);
         loseAll(database, file);
-        all.push_back(database);
     }
 }
 
@@ -179,84 +162,67 @@ std::string withCarriageReturns(const std::string& text) {
     return result;
 }
 
+void addWholes(std::vector<DamagedDatabase>& all, const std::string& file) {
+    addWhole(
+        all, file, "is empty", [](auto& text) { text.clear(); }, false);
+    addWhole(
+        all, file, "has no final newline", [](auto& text) { text.pop_back(); }, true);
+    addWhole(
+        all, file, "has CRLF", [](auto& text) { text = withCarriageReturns(text); }, true);
+    addWhole(
+        all, file, "is CR alone",
+        [](auto& text) { std::replace(text.begin(), text.end(), '\n', '\r'); }, false);
+    addWhole(
+        all, file, "ends in zeros", [](auto& text) { text.append(5000, '\0'); }, true);
+    addWhole(
+        all, file, "is zeros", [](auto& text) { text.assign(5000, '\0'); }, false);
+    addWhole(
+        all, file, "is newlines", [](auto& text) { text.assign(5000, '\n'); }, false);
+    addWhole(
+        all, file, "begins with empty lines", [](auto& text) { text.insert(0, 1000, '\n'); }, true);
+}
+
+void addMissing(std::vector<DamagedDatabase>& all, const std::string& file) {
+    DamagedDatabase& missing = add(all, file, "is missing", undamagedFiles());
+    missing.files.erase(file);
+    loseAll(missing, file);
+}
+
+void addCuts(std::vector<DamagedDatabase>& all, const std::string& file) {
+    const std::size_t size = undamagedFiles().at(file).size();
+    for (std::size_t length = 1; length < size; length += 7) {
+        DamagedDatabase& cut =
+            add(all, file, "is cut after " + std::to_string(length) + " bytes", undamagedFiles());
+        cut.files[file].resize(length);
+        loseLast(cut, file);
+        if (victims().count(file) != 0 && length < frames().at(file).first.size()) {
+            loseAll(cut, file);
+        }
+    }
+}
+
 void addFiles(std::vector<DamagedDatabase>& all) {
-    for (const auto& [file, fields] : victims()) {
-        DamagedDatabase missing{file + " is missing", undamaged()};
-        missing.files.erase(file);
-        loseAll(missing, file);
-        all.push_back(missing);
+    for (const auto& [file, content] : undamagedFiles()) {
+        addMissing(all, file);
         addPlaces(all, file);
-        addWhole(
-            all, file, "is empty", [](auto& text) { text.clear(); }, false);
-        addWhole(
-            all, file, "has no final newline", [](auto& text) { text.pop_back(); }, true);
-        addWhole(
-            all, file, "has CRLF", [](auto& text) { text = withCarriageReturns(text); }, true);
-        addWhole(
-            all, file, "is CR alone",
-            [](auto& text) { std::replace(text.begin(), text.end(), '\n', '\r'); }, false);
-        addWhole(
-            all, file, "ends in zeros", [](auto& text) { text.append(5000, '\0'); }, true);
-        addWhole(
-            all, file, "is zeros", [](auto& text) { text.assign(5000, '\0'); }, false);
-        addWhole(
-            all, file, "is newlines", [](auto& text) { text.assign(5000, '\n'); }, false);
-        addWhole(
-            all, file, "begins with empty lines", [](auto& text) { text.insert(0, 1000, '\n'); },
-            true);
-        const std::size_t size = undamaged().at(file).size();
-        for (std::size_t length = 1; length < size; length += 7) {
-            DamagedDatabase cut{file + " is cut after " + std::to_string(length) + " bytes",
-                                undamaged()};
-            cut.files[file].resize(length);
-            loseLast(cut, file);
-            if (length < frames().at(file).first.size()) {
-                loseAll(cut, file);
-            }
-            all.push_back(cut);
-        }
+        addWholes(all, file);
+        addCuts(all, file);
     }
 }
 
-// ---- At random
-
-using Random = std::mt19937;
-
-std::size_t below(Random& random, std::size_t bound) { return random() % bound; }
-
-char anyByte(Random& random) {
-    static const std::string favourites(":\n,:\n\0\r+-#!*0129 \xFF\xC3", 19);
-    return below(random, 2) == 0 ? favourites[below(random, favourites.size())]
-                                 : static_cast<char>(random() & 0xFFU);
-}
-
-void damageOnce(Random& random, std::string& text) {
-    const std::size_t at = below(random, text.size() + 1);
-    const std::size_t length = std::min(below(random, 20), text.size() - at);
-    switch (below(random, 5)) {
-    case 0:
-        text.erase(at, length);
-        break;
-    case 1:
-        text.insert(at, 1, anyByte(random));
-        break;
-    case 2:
-        text.insert(below(random, text.size() + 1), text.substr(at, length));
-        break;
-    case 3:
-        text.insert(at, below(random, 3000), anyByte(random));
-        break;
-    default:
-        if (at < text.size()) {
-            text[at] = anyByte(random);
+// Settings of other values, twice, and in lines that are none.
+void addSettings(std::vector<DamagedDatabase>& all) {
+    for (const auto& [file, content] : policyFiles()) {
+        const std::size_t begin = content.rfind('=') + 1;
+        for (const auto& [word, value] : badValues()) {
+            Files files = undamagedFiles();
+            files[file] = content.substr(0, begin) + value + "\n" + content;
+            add(all, file, "a setting of another value: " + word, files);
+            files[file] = value + "\n" + value + "=" + value + "\n" + content;
+            add(all, file, "lines before it: " + word, files);
+            files[file] = content + "=" + value + "\n= " + value + " \\\n#" + value + "\n[" + value;
+            add(all, file, "lines after it: " + word, files);
         }
-        break;
-    }
-}
-
-void damage(Random& random, std::string& text) {
-    for (std::size_t count = 1 + below(random, 8); count > 0; --count) {
-        damageOnce(random, text);
     }
 }
 
@@ -267,26 +233,8 @@ std::vector<DamagedDatabase> damagedDatabases() {
     addFields(all);
     addLines(all);
     addFiles(all);
+    addSettings(all);
     return all;
-}
-
-DamagedDatabase randomlyDamaged(std::uint32_t seed) {
-    Random random(seed);
-    DamagedDatabase database{"seed " + std::to_string(seed), {}};
-    const bool whole = below(random, 3) == 0;
-    for (const auto& [file, frame] : frames()) {
-        std::string line = joined(victims().at(file)) + "\n";
-        if (!whole) {
-            damage(random, line);
-            database.files[file] = frame.first + line + "\n" + frame.second;
-        } else {
-            database.files[file] = frame.first + line + frame.second;
-            damage(random, database.files[file]);
-        }
-    }
-    database.firstAccount = database.lastAccount = !whole;
-    database.firstGroup = database.lastGroup = !whole;
-    return database;
 }
 
 } // namespace qelo::test

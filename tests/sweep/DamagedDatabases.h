@@ -4,8 +4,10 @@
 // their end; the damage lies between, unless the database says that it cannot.
 #pragma once
 
+#include "SampleDatabase.h"
+
 #include <cstdint>
-#include <map>
+#include <set>
 #include <string>
 #include <vector>
 
@@ -13,22 +15,27 @@ namespace qelo::test {
 
 struct DamagedDatabase {
     std::string name;
-    // Content by file name (passwd, shadow, group, gshadow); a file that is not in it is
+    // The account files and those with the rules for passwords; a file that is not in it is
     // missing.
-    std::map<std::string, std::string> files;
+    Files files;
     // The file of that name is a directory, a pipe without a writer, a link to itself, or
     // readable to nobody.
     enum class Place { File, Directory, Pipe, LoopingLink, Unreadable };
     Place place = Place::File;
     std::string placeOf = {};
-    // Whether the undamaged lines are there to be read.
+    // Properties of accounts that may have another value for the damage.
+    std::set<std::string> open = {};
+    // Whether the damaged file is one that enumerations read.
+    bool isRead = true;
+    // Whether the undamaged lines are known to be there. Else their state tells.
     bool firstAccount = true;
     bool lastAccount = true;
     bool firstGroup = true;
     bool lastGroup = true;
 };
 
-// Every field of every file damaged in every way, and every file as a whole.
+// Every field of every account file damaged in every way, every setting of the other files, and
+// every file as a whole.
 std::vector<DamagedDatabase> damagedDatabases();
 
 // Bytes of the lines between, or of whole files, changed at random; the same for the same seed.

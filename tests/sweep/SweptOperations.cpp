@@ -1,5 +1,5 @@
 // The catalogue of operations.
-#include "SweptProviders.h"
+#include "SweptLibrary.h"
 
 #include <utility>
 
@@ -36,6 +36,8 @@ const std::map<std::string, Served>& served() {
          {"ZANTH_AccountHostedService", "Antecedent", "", "Dependent", 4}},
         {"SimElementCapabilitiesProvider",
          {"ZANTH_SimElementCapabilities", "ManagedElement", "", "Capabilities", 4}},
+        {"QeloComputerSystemProvider",
+         {"ZANTH_ComputerSystem", "Name", "host.example", "ElementName", 1}},
     };
     return all;
 }
@@ -55,8 +57,8 @@ const char** someOf(const Served& served) {
 
 class Catalogue {
 public:
-    Catalogue(SweptProviders& providers, const std::string& provider)
-        : broker_(providers.broker()), interfaces_(providers.interfaces(provider)),
+    Catalogue(SweptLibrary& library, const std::string& provider)
+        : broker_(library.broker()), interfaces_(library.interfaces(provider)),
           served_(served().at(provider)) {}
 
     std::vector<SweptOperation> all() {
@@ -284,8 +286,8 @@ private:
 
 } // namespace
 
-std::vector<SweptOperation> operationsOf(SweptProviders& providers, const std::string& provider) {
-    return Catalogue(providers, provider).all();
+std::vector<SweptOperation> operationsOf(SweptLibrary& library, const std::string& provider) {
+    return Catalogue(library, provider).all();
 }
 
 } // namespace qelo::test

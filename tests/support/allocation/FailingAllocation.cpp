@@ -1,5 +1,6 @@
 #include "FailingAllocation.h"
 
+#include <algorithm>
 #include <array>
 #include <climits>
 #include <cstdint>
@@ -13,6 +14,8 @@
 namespace qelo::test {
 
 namespace {
+
+constexpr std::size_t kMostLibraries = 8;
 
 struct Range {
     std::uintptr_t first = 0;
@@ -63,6 +66,26 @@ Range rangeAround(void* address) {
     return dladdr(address, &info) != 0 ? rangeOf(info.dli_fname) : Range{};
 }
 
+using Ranges = std::array<Range, kMostLibraries>;
+
+// Where these files are loaded. Libraries under test stay where they are, and one sweep asks
+// for the same ones over and over.
+const Ranges& rangesOf(const FailingAllocation::Files& files) {
+    static thread_local FailingAllocation::Files known;
+    static thread_local Ranges ranges;
+    if (known != files) {
+        ranges = {};
+        for (std::size_t i = 0; i < files.size(); ++i) {
+            ranges[i] = rangeOf(files[i].c_str());
+            if (ranges[i].end == 0) {
+                std::abort(); // not loaded, so that nothing of it would count
+            }
+        }
+        known = files;
+    }
+    return ranges;
+}
+
 // The blocks that are in use, in the order of their making. In memory of its own, since it is
 // called from the operators themselves.
 class Ledger {
@@ -103,17 +126,23 @@ private:
 struct Plan {
     bool armed = false;
     bool counting = false;
-    bool looking = false; // while the caller is being found out, which may allocate
-    std::size_t left = 0;
+    bool looking = false;    // while the caller is being found out, which may allocate
+    std::size_t reached = 0; // allocations of the libraries
+    std::size_t failing = 0; // the one that fails; 0 is none
     bool hit = false;
-    Range library;
+    Ranges libraries;
     Range cxxLibrary;
     Ledger blocks;
+
+    bool concerns(const void* address) const {
+        return std::any_of(libraries.begin(), libraries.end(),
+                           [&](const Range& library) { return library.holds(address); });
+    }
 };
 thread_local Plan plan;
 
-// Whether the library stands behind an allocation that the C++ library makes for its caller.
-// `caller` is where the operator returns to; what stands beyond it is on the stack.
+// Whether one of the libraries stands behind an allocation that the C++ library makes for its
+// caller. `caller` is where the operator returns to; what stands beyond it is on the stack.
 bool standsBehind(const void* caller) {
     std::array<void*, 16> frames{};
     const int count = backtrace(frames.data(), static_cast<int>(frames.size()));
@@ -122,19 +151,19 @@ bool standsBehind(const void* caller) {
         const void* frame = frames.at(static_cast<std::size_t>(i));
         beyond = beyond || frame == caller;
         if (beyond && !plan.cxxLibrary.holds(frame)) {
-            return plan.library.holds(frame);
+            return plan.concerns(frame);
         }
     }
     return false;
 }
 
-// Whether the allocation is the library's, as far as that is still of interest.
+// Whether the allocation is one of the libraries', as far as that is still of interest.
 bool counts(const void* caller) {
     if (!plan.armed || plan.looking || (plan.hit && !plan.counting)) {
         return false;
     }
     if (!plan.cxxLibrary.holds(caller)) {
-        return plan.library.holds(caller);
+        return plan.concerns(caller);
     }
     plan.looking = true;
     const bool result = standsBehind(caller);
@@ -144,7 +173,8 @@ bool counts(const void* caller) {
 
 void* allocate(std::size_t size, const void* caller) {
     const bool counted = counts(caller);
-    if (counted && !plan.hit && --plan.left == 0) {
+    plan.reached += counted && !plan.hit ? 1 : 0;
+    if (counted && !plan.hit && plan.reached == plan.failing) {
         plan.hit = true;
         throw std::bad_alloc();
     }
@@ -167,16 +197,30 @@ void release(void* memory) {
 
 } // namespace
 
-void FailingAllocation::arm(const std::string& library, std::size_t n) {
+void FailingAllocation::arm(const std::string& library, std::size_t n) { arm(Files{library}, n); }
+
+void FailingAllocation::arm(const Files& libraries, std::size_t n) {
     std::array<void*, 1> frame{};
     backtrace(frame.data(), 1); // its first use loads a library
-    plan.library = rangeOf(library.c_str());
-    plan.cxxLibrary = rangeAround(dlsym(RTLD_DEFAULT, "_ZNSaIcEC1Ev"));
-    plan.left = n;
+    if (libraries.size() > kMostLibraries) {
+        std::abort();
+    }
+    static const Range cxxLibrary = rangeAround(dlsym(RTLD_DEFAULT, "_ZNSaIcEC1Ev"));
+    plan.cxxLibrary = cxxLibrary;
+    plan.libraries = rangesOf(libraries);
+    plan.failing = n;
+    plan.reached = 0;
     plan.blocks.clear();
     plan.hit = false;
     plan.armed = true;
 }
+
+bool FailingAllocation::stopFailing() {
+    plan.failing = 0;
+    return plan.hit;
+}
+
+std::size_t FailingAllocation::reached() { return plan.reached; }
 
 bool FailingAllocation::disarm() {
     plan.armed = false;

@@ -9,14 +9,21 @@ namespace qelo::sweep {
 inline constexpr const char* kPlanVariable = "QELO_FAULT_PLAN";
 inline constexpr const char* kRootVariable = "QELO_FAULT_ROOT";
 
+// What happens at a call. Each way counts the calls that it can happen to, and no others.
+enum class FaultWay : int {
+    Error, // any call: one fails
+    Kill,  // any call: one ends its process
+    Short, // write() to a plain file: one writes half of the data, and says so
+    Full,  // what needs room on the disk: one writes half of the data, all later ones fail
+};
+
 struct FaultPlan {
-    int begun;       // whether a file of the root has been asked for
-    long calls;      // counted since then
-    long failAt;     // the number of the first call that fails, from 1; 0 is none
-    long failUntil;  // the number of the last one
-    int error;       // the errno that the failed call leaves
-    int kill;        // the call ends its process instead
-    char failed[96]; // the program and the name of the first call that failed
+    int begun;   // whether a file of the root has been asked for
+    long calls;  // counted since then
+    long failAt; // the number of the first call that it happens to, from 1; 0 is none
+    FaultWay way;
+    int error;       // the errno that a failed call leaves
+    char failed[96]; // the program and the name of the first call that it happened to
 };
 
 } // namespace qelo::sweep

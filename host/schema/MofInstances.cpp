@@ -1,7 +1,6 @@
 // Static instances.
 #include "MofParser.h"
 
-
 namespace qelo::schema {
 
 void MofParser::instanceProperty(const cim::Class& known, cim::Instance& instance) {

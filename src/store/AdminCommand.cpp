@@ -46,7 +46,10 @@ bool hasValue(const CMPIData& argument) {
 
 // The text of a string; empty for none. `status` receives that of reading it.
 const char* readText(const CMPIString* string, CMPIStatus* status) {
-    const char* text = isNull(string) ? nullptr : string->ft->getCharPtr(string, status);
+    if (string == nullptr || isNull(string)) {
+        return "";
+    }
+    const char* text = string->ft->getCharPtr(string, status);
     return text != nullptr ? text : "";
 }
 

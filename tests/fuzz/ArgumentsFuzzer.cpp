@@ -59,7 +59,8 @@ void checkSpelledOut(const std::vector<std::string>& texts) {
     const auto result = spelledOut(static_cast<int>(given.size()), given.data());
     require(result.size() == texts.size());
     for (std::size_t i = 0; i < result.size(); ++i) {
-        require(result[i] == texts[i].c_str() || result[i].compare(0, 2, "--") == 0);
+        require(result[i] == texts[i].substr(0, texts[i].find('\0')) ||
+                result[i].compare(0, 2, "--") == 0);
     }
 }
 

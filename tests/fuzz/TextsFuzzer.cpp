@@ -74,7 +74,7 @@ void checkLogLine(std::string_view text) {
     const std::string component(text.substr(0, text.size() / 2));
     const logging::Line line{component.c_str(), component.c_str(), 1, component, 6000, text};
     const std::string whole = logging::formatLine(line);
-    require(!hasControl(whole) && cim::isValidUtf8(whole) && whole.size() < 34 * 1024);
+    require(!hasControl(whole) && cim::isValidUtf8(whole) && whole.size() < 34UL * 1024);
 }
 
 } // namespace

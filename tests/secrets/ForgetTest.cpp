@@ -75,8 +75,9 @@ __attribute__((noinline)) std::uintptr_t crossStack() {
     for (volatile char& c : deep) {
         c = 'x';
     }
-    const auto place = reinterpret_cast<std::uintptr_t>(&deep[0]);
-    return place; // for looking at what is left there
+    // Volatile, since compilers warn of addresses that are of no use any more. This one is.
+    volatile auto place = reinterpret_cast<std::uintptr_t>(&deep[0]);
+    return place;
 }
 
 __attribute__((noinline)) std::uintptr_t crossHeap() {

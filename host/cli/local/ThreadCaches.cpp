@@ -47,6 +47,7 @@ void limitThreadCaches() {
         return;
     }
     std::vector<char*> arguments;
+    arguments.reserve(texts.size() + 1);
     for (std::string& text : texts) {
         arguments.push_back(text.data());
     }

@@ -50,7 +50,7 @@ inline cim::Instance sampleInstance(cim::ObjectPath path = samplePath()) {
     instance.setProperty("S64", Value::signedInteger(Type::SInt64, INT64_MIN));
     instance.setProperty("R32", Value::real(Type::Real32, static_cast<double>(0.1F)));
     instance.setProperty("R64", Value::real(Type::Real64, 1e300));
-    instance.setProperty("Infinite", Value::real(Type::Real64, -INFINITY));
+    instance.setProperty("Infinite", Value::real(Type::Real64, -HUGE_VAL));
     instance.setProperty("When",
                          Value::dateTime(*cim::DateTime::parse("00000001000000.000000:000")));
     instance.setProperty("Inner", Value::instance(middle));

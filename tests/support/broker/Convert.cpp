@@ -11,7 +11,9 @@ constexpr CMPIType simpleType(CMPIType type) { return static_cast<CMPIType>(type
 // The value may be a variable of its own type, so it must not be read as a whole CMPIValue.
 template <typename T> T load(const CMPIValue* value) {
     T result;
-    std::memcpy(&result, static_cast<const void*>(value), sizeof result);
+    // Of a pointer, the pointer itself is meant.
+    std::memcpy(&result, static_cast<const void*>(value),
+                sizeof result); // NOLINT(bugprone-sizeof-expression)
     return result;
 }
 

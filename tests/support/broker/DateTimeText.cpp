@@ -110,17 +110,17 @@ std::string dateTimeTextOf(std::uint64_t microseconds, bool interval) {
     std::array<char, 64> text{};
     if (interval) {
         const auto ofDay = static_cast<unsigned>(seconds % 86400);
-        std::snprintf(text.data(), text.size(), "%08llu%02u%02u%02u.%06u:000",
-                      static_cast<unsigned long long>(seconds / 86400 % 100000000), ofDay / 3600,
-                      ofDay / 60 % 60, ofDay % 60, fraction);
+        (void)std::snprintf(text.data(), text.size(), "%08llu%02u%02u%02u.%06u:000",
+                            static_cast<unsigned long long>(seconds / 86400 % 100000000),
+                            ofDay / 3600, ofDay / 60 % 60, ofDay % 60, fraction);
         return text.data();
     }
     const auto point = static_cast<std::time_t>(seconds);
     std::tm parts{};
     gmtime_r(&point, &parts);
     std::array<char, 32> date{};
-    std::strftime(date.data(), date.size(), "%Y%m%d%H%M%S", &parts);
-    std::snprintf(text.data(), text.size(), "%s.%06u+000", date.data(), fraction);
+    (void)std::strftime(date.data(), date.size(), "%Y%m%d%H%M%S", &parts);
+    (void)std::snprintf(text.data(), text.size(), "%s.%06u+000", date.data(), fraction);
     return text.data();
 }
 

@@ -177,7 +177,7 @@ TEST_F(HostileNodeFile, In_whose_place_is_something_else_is_not_served) {
 }
 
 TEST_F(HostileNodeFile, At_random_is_served_whole_or_not_at_all) {
-    std::mt19937 random(1);
+    std::mt19937 random(1); // NOLINT(cert-msc32-c,cert-msc51-cpp): the same each time
     const std::size_t count = isLongSweep() ? 20000 : 500;
     for (std::size_t i = 0; i < count; ++i) {
         std::string document = kDocument;

@@ -64,7 +64,7 @@ QELO_CALL int execve(const char* path, char* const* arguments, char* const* envi
 }
 QELO_CALL int posix_spawn(pid_t* child, const char* path, const posix_spawn_file_actions_t* actions,
                           const posix_spawnattr_t* attributes, char* const* arguments,
-                          char* const* environment) noexcept {
+                          char* const* environment) {
     QELO_NEXT(posix_spawn)
     if (fails("posix_spawn")) {
         return errno;
